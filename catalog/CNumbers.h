@@ -1,0 +1,22 @@
+// Reading numbers from catalogue text exactly as the C library's "%lf" conversion does, in
+// the "C" locale whatever locale the program runs in, with a fast path for plain decimals.
+#pragma once
+
+// Whitespace as the "C" locale's isspace sees it.
+inline bool IsCSpace(char c)
+{
+    return c == ' ' || (c >= '\t' && c <= '\r');
+}
+
+// Reads one number at text (a NUL-terminated string) like sscanf(text, "%lf"): leading
+// blanks are skipped, signs, exponents, hexadecimal, "inf" and "nan" are accepted. Returns
+// false when no number is there, leaving *value untouched; otherwise stores it and, when
+// next is given, where the number ended.
+bool ScanDouble(const char* text, double* value, const char** next = nullptr);
+
+// The fields of a catalogue data line, as sscanf(line, "%s %lf %lf %lf %lf") would fill them.
+// classText must hold 501 bytes; line is NUL-terminated or ends at end, whichever comes first,
+// and is at most 500 characters long. Fields that are not read keep their values. Returns
+// the number of fields read, or -1 for a line with nothing but blanks.
+int ScanCatalogueData(const char* line, const char* end, char* classText, double* magnitude,
+    double* x, double* y, double* z);

@@ -1,0 +1,20 @@
+// One star: its absolute magnitude and spectral class.
+#pragma once
+
+#include "catalog/GravSystem.h"
+#include "catalog/SpectralClass.h"
+
+class Star : public GravSystem {
+public:
+    Star(const char* name, const char* spectralClassText, double magnitude, int32_t blockSize);
+
+    int32_t WhatAmI() const override { return kStarKind; }
+
+    double GetMagnitude() const { return magnitude; }
+    SpectralClass* GetSpectralClass() { return &spectralClass; }
+    const SpectralClass* GetSpectralClass() const { return &spectralClass; }
+    const char* GetSpectralClassString() const { return spectralClass.GetSCString(); }
+
+    double magnitude; // absolute magnitude, as read from the catalogue
+    SpectralClass spectralClass;
+};

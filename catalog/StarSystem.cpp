@@ -1,0 +1,11 @@
+// A star system's construction.
+#include "catalog/StarSystem.h"
+
+StarSystem::StarSystem(const char* name, SVector position, double luminosity,
+    const ColorTable* colorTable, int32_t blockSize)
+    : GravSystem(name, blockSize)
+    , position(position)
+    , luminosity(luminosity)
+    , colorTable(colorTable)
+{
+}

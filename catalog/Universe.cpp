@@ -1,0 +1,168 @@
+// Reading the catalogue file and generating random universes.
+#include "catalog/Universe.h"
+
+#include "catalog/CNumbers.h"
+#include "catalog/Star.h"
+#include "core/Constants.h"
+#include "platform/ExecutablePath.h"
+#include "render/SpectralTables.h"
+
+#include <algorithm>
+#include <cmath>
+#include <cstdio>
+#include <cstring>
+#include <filesystem>
+#include <memory>
+#include <vector>
+
+namespace {
+
+// A line is read up to its line feed or to this many characters; a longer line is split, its
+// next character dropped as if it were the line feed.
+constexpr size_t kMaxLine = 500;
+// Names are kept to this many characters.
+constexpr size_t kMaxName = 79;
+// One record is two lines and their two line feeds.
+constexpr size_t kMaxRecord = 2 * (kMaxLine + 1);
+// The file is read through a window of this size, so a catalogue of a million stars never
+// needs its whole text in memory at once.
+constexpr size_t kWindow = size_t(1) << 20;
+
+// The catalogue text seen through a sliding window that always holds a whole record when the
+// file has one left.
+class CatalogueText {
+public:
+    explicit CatalogueText(std::FILE* file)
+        : fFile(file)
+        , fBuffer(kWindow + kMaxRecord)
+    {
+        std::setvbuf(file, nullptr, _IONBF, 0);
+    }
+
+    // True while the read position is inside the text.
+    bool More()
+    {
+        if (!fEnded && fLimit - fPosition < kMaxRecord)
+            Refill();
+        return fPosition < fLimit;
+    }
+
+    // The next line: its characters up to the line feed, at most kMaxLine of them; the read
+    // position then steps over one more character.
+    std::pair<const char*, size_t> Line()
+    {
+        const char* start = fBuffer.data() + std::min(fPosition, fLimit);
+        const size_t available = fPosition < fLimit ? std::min(kMaxLine, fLimit - fPosition) : 0;
+        const void* feed = std::memchr(start, '\n', available);
+        const size_t length = feed ? static_cast<const char*>(feed) - start : available;
+        fPosition += length + 1;
+        return { start, length };
+    }
+
+private:
+    void Refill()
+    {
+        const size_t kept = fPosition < fLimit ? fLimit - fPosition : 0;
+        std::memmove(fBuffer.data(), fBuffer.data() + fLimit - kept, kept);
+        fLimit = kept;
+        fPosition = 0;
+        while (!fEnded && fLimit < fBuffer.size()) {
+            const size_t got
+                = std::fread(fBuffer.data() + fLimit, 1, fBuffer.size() - fLimit, fFile);
+            fLimit += got;
+            if (got == 0)
+                fEnded = true;
+        }
+    }
+
+    std::FILE* fFile;
+    std::vector<char> fBuffer;
+    size_t fPosition = 0;
+    size_t fLimit = 0;
+    bool fEnded = false;
+};
+
+std::filesystem::path CataloguePath(const char* fileName)
+{
+    const std::filesystem::path path(fileName);
+    if (path.is_absolute())
+        return path;
+    return ExecutableDirectory() / path;
+}
+
+} // namespace
+
+const ColorTable* SpectralTableFor(HarvardClass hc)
+{
+    if (!gSpectralCTable)
+        return nullptr;
+    const int table = hc >= kClassO && hc <= kClassM ? hc - kClassO : kClassG - kClassO;
+    return gSpectralCTable + table;
+}
+
+Universe::Universe(int32_t blockSize)
+    : BList(blockSize)
+{
+}
+
+Universe::Universe(const char* fileName, int32_t maxStars, int32_t blockSize)
+    : BList(blockSize)
+{
+    if (!fileName)
+        return;
+    std::unique_ptr<std::FILE, int (*)(std::FILE*)> file(
+        std::fopen(CataloguePath(fileName).c_str(), "rb"), &std::fclose);
+    if (!file)
+        return;
+
+    CatalogueText text(file.get());
+    // The scan targets live across records: a line with fewer fields keeps the values the
+    // record before it had.
+    char classText[kMaxLine + 1] = "";
+    double magnitude = 0, x = 0, y = 0, z = 0;
+    SVector previous(0, 0, 314000); // no catalogue star sits there
+    char name[kMaxName + 1];
+    StarSystem* system = nullptr;
+
+    for (int32_t records = 0; records < maxStars && text.More(); records++) {
+        const auto [nameLine, nameLength] = text.Line();
+        const size_t kept = std::min(nameLength, kMaxName);
+        std::memcpy(name, nameLine, kept);
+        name[kept] = '\0';
+
+        const auto [dataLine, dataLength] = text.Line();
+        ScanCatalogueData(dataLine, dataLine + dataLength, classText, &magnitude, &x, &y, &z);
+
+        auto* star = new Star(name, classText, magnitude, 1);
+        // A first record at the sentinel position still opens a system of its own.
+        if (!system || x != previous.x || y != previous.y || z != previous.z) {
+            previous.Set(x, y, z);
+            const double luminosity = std::pow(2.512, 4.7 - magnitude);
+            system = new StarSystem(
+                name, previous, luminosity, SpectralTableFor(star->spectralClass.harvardClass), 2);
+            AddItem(system);
+        }
+        system->AddItem(star);
+    }
+}
+
+Universe::Universe(double radius, stellarDensity density, int32_t blockSize, Random random)
+    : BList(blockSize)
+{
+    // pi, not 4/3 pi: the count is a density over the generator's cube, not a sphere.
+    const auto count = static_cast<int64_t>(
+        kPI * radius * radius * radius * static_cast<int32_t>(density) * 0.01);
+    for (int64_t i = 0; i < count; i++) {
+        const double x = random.Rand(20000) * 0.0001 * radius - radius;
+        const double y = random.Rand(20000) * 0.0001 * radius - radius;
+        const double z = random.Rand(20000) * 0.0001 * radius - radius;
+        AddItem(new StarSystem("", SVector(x, y, z), 1.0, nullptr, 5));
+    }
+}
+
+Universe::~Universe()
+{
+    const int32_t count = CountItems();
+    for (int32_t i = 0; i < count; i++)
+        delete static_cast<StarSystem*>(ItemAtFast(i));
+}

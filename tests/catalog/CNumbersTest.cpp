@@ -1,0 +1,136 @@
+#include "catalog/CNumbers.h"
+
+#include <gtest/gtest.h>
+
+#include <cmath>
+#include <cstdio>
+#include <cstring>
+#include <random>
+#include <string>
+
+namespace {
+
+struct Fields {
+    int count;
+    char word[501];
+    double m, x, y, z;
+};
+
+Fields Reference(const std::string& line)
+{
+    Fields f {};
+    std::strcpy(f.word, "unset");
+    f.m = f.x = f.y = f.z = -777;
+    f.count = std::sscanf(line.c_str(), "%s %lf %lf %lf %lf", f.word, &f.m, &f.x, &f.y, &f.z);
+    return f;
+}
+
+Fields Ours(const std::string& line)
+{
+    Fields f {};
+    std::strcpy(f.word, "unset");
+    f.m = f.x = f.y = f.z = -777;
+    f.count
+        = ScanCatalogueData(line.data(), line.data() + line.size(), f.word, &f.m, &f.x, &f.y, &f.z);
+    return f;
+}
+
+void ExpectSame(const std::string& line)
+{
+    const Fields a = Reference(line), b = Ours(line);
+    EXPECT_EQ(a.count, b.count) << '"' << line << '"';
+    EXPECT_STREQ(a.word, b.word) << '"' << line << '"';
+    for (auto [u, v] : { std::pair { a.m, b.m }, { a.x, b.x }, { a.y, b.y }, { a.z, b.z } }) {
+        if (std::isnan(u))
+            EXPECT_TRUE(std::isnan(v)) << '"' << line << '"';
+        else
+            EXPECT_EQ(u, v) << '"' << line << '"';
+    }
+}
+
+} // namespace
+
+TEST(CNumbers, CatalogueLinesReadExactlyAsTheCLibraryReadsThem)
+{
+    const char* lines[] = {
+        "G2V 4.83 0 0 0",
+        "  A1V   1.42\t-0.494323 -0.758719 2.5",
+        "K5 7.5 3.5 -0.75 2.3          ",
+        "M4 11.2 3.5",
+        "M4 11.2",
+        "M4",
+        "",
+        "     ",
+        "G0 4.5 x 5 6",
+        "B1 +1.5e0 0x10 -.25 1E2",
+        "B1 1.5 2.5-3.5 4",
+        "B1 1e 2 3 4",
+        "B1 1e+ 2 3 4",
+        "B1 inf -inf nan 4",
+        "B1 infinity 1e400 1e-400 4",
+        "B1 4.9406564584124654e-324 2.2250738585072014e-308 1.7976931348623157e308 -0",
+        "B1 .5 -.5 5. -5.",
+        "B1 - 2 3 4",
+        "B1 . 2 3 4",
+        "B1 00012.50000 -0000.0 1 2",
+        "B1 1 2 3 4 5 6 extra words",
+        "B1 0.1000000000000000055511151231257827021181583404541015625 2 3 4",
+        "B1 1 2 3 4\r",
+    };
+    for (const char* line : lines)
+        ExpectSame(line);
+}
+
+TEST(CNumbers, RandomDecimalsMatchTheCLibraryBitForBit)
+{
+    std::mt19937_64 random(12345);
+    std::uniform_real_distribution<double> spread(-400, 400);
+    char line[200];
+    for (int i = 0; i < 20000; i++) {
+        const int digits = int(random() % 18);
+        std::snprintf(line, sizeof line, "G%dV %.*f %.*g %.*e %.*f", int(random() % 10), digits,
+            spread(random), digits + 1, spread(random), digits, spread(random) * 1e-3, digits,
+            spread(random));
+        ExpectSame(line);
+    }
+}
+
+TEST(CNumbers, LineEndsAtItsEndPointerOrAtANul)
+{
+    const std::string line = "G2 1 2 3 4 99";
+    Fields f {};
+    f.z = -1;
+    // Only "G2 1 2 3" is inside the line: z keeps its value.
+    EXPECT_EQ(ScanCatalogueData(line.data(), line.data() + 8, f.word, &f.m, &f.x, &f.y, &f.z), 4);
+    EXPECT_EQ(f.y, 3);
+    EXPECT_EQ(f.z, -1);
+
+    const std::string withNul("G2 1 2\0 3 4", 11);
+    f.y = f.z = -1;
+    EXPECT_EQ(ScanCatalogueData(
+                  withNul.data(), withNul.data() + withNul.size(), f.word, &f.m, &f.x, &f.y, &f.z),
+        3);
+    EXPECT_EQ(f.x, 2);
+    EXPECT_EQ(f.y, -1);
+}
+
+TEST(CNumbers, ScanDoubleLikePercentLf)
+{
+    double v = -1;
+    const char* next = nullptr;
+    EXPECT_TRUE(ScanDouble("2V", &v, &next));
+    EXPECT_EQ(v, 2);
+    EXPECT_STREQ(next, "V");
+    EXPECT_TRUE(ScanDouble(" 3.5III", &v, &next));
+    EXPECT_EQ(v, 3.5);
+    EXPECT_STREQ(next, "III");
+    EXPECT_TRUE(ScanDouble("+7", &v));
+    EXPECT_EQ(v, 7);
+    EXPECT_TRUE(ScanDouble("0x1p3", &v));
+    EXPECT_EQ(v, 8);
+    v = -1;
+    EXPECT_FALSE(ScanDouble("x", &v));
+    EXPECT_FALSE(ScanDouble("", &v));
+    EXPECT_FALSE(ScanDouble("+", &v));
+    EXPECT_EQ(v, -1);
+}

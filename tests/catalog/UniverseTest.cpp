@@ -1,0 +1,331 @@
+#include "TempCatalogue.h"
+
+#include "catalog/Star.h"
+#include "catalog/Universe.h"
+#include "platform/ExecutablePath.h"
+#include "render/SpectralTables.h"
+
+#include <gtest/gtest.h>
+
+#include <cmath>
+#include <string>
+
+namespace {
+
+// Every test reads with the spectral tables in place, as the program does.
+class UniverseTest : public ::testing::Test {
+protected:
+    ScopedSpectralTables tables;
+
+    static const ColorTable* Table(int n) { return gSpectralCTable + n; }
+};
+
+} // namespace
+
+TEST_F(UniverseTest, StarsAtOnePositionInARowFormOneSystem)
+{
+    const TempCatalogue file("Alpha A\nG2V 4.38 1 2 3\nAlpha B\nK1V 5.71 1 2 3\n");
+    const Universe u(file.PathString().c_str(), 1000000, 5000);
+    ASSERT_EQ(u.CountItems(), 1);
+    const StarSystem* s = u.SystemAt(0);
+    EXPECT_STREQ(s->GetName(), "Alpha A");
+    ASSERT_EQ(s->CountItems(), 2);
+    EXPECT_STREQ(s->StarAt(0)->GetName(), "Alpha A");
+    EXPECT_STREQ(s->StarAt(1)->GetName(), "Alpha B");
+    EXPECT_DOUBLE_EQ(s->luminosity, std::pow(2.512, 4.7 - 4.38));
+}
+
+TEST_F(UniverseTest, TheSameStarsSeparatedByAnotherPositionFormThreeSystems)
+{
+    const TempCatalogue file(
+        "Alpha A\nG2V 4.38 1 2 3\nElsewhere\nM5 15 9 9 9\nAlpha B\nK1V 5.71 1 2 3\n");
+    const Universe u(file.PathString().c_str(), 1000000, 5000);
+    ASSERT_EQ(u.CountItems(), 3);
+    for (int i = 0; i < 3; i++)
+        EXPECT_EQ(u.SystemAt(i)->CountItems(), 1);
+    EXPECT_STREQ(u.SystemAt(2)->GetName(), "Alpha B");
+}
+
+TEST_F(UniverseTest, AFirstRecordAtTheSentinelStillOpensASystem)
+{
+    const TempCatalogue file("Far\nG2 1 0 0 314000\nFar B\nK2 2 0 0 314000\n");
+    const Universe u(file.PathString().c_str(), 1000000, 5000);
+    ASSERT_EQ(u.CountItems(), 1);
+    EXPECT_EQ(u.SystemAt(0)->CountItems(), 2);
+    EXPECT_EQ(u.SystemAt(0)->position.z, 314000);
+}
+
+TEST_F(UniverseTest, LuminosityFollowsTheMagnitudeOfThePrimary)
+{
+    const TempCatalogue file("Sun-like\nG2V 4.7 1 0 0\nBright\nA0 -0.3 2 0 0\n");
+    const Universe u(file.PathString().c_str(), 1000000, 5000);
+    ASSERT_EQ(u.CountItems(), 2);
+    EXPECT_DOUBLE_EQ(u.SystemAt(0)->luminosity, 1.0);
+    EXPECT_DOUBLE_EQ(u.SystemAt(1)->luminosity, std::pow(2.512, 5.0));
+    EXPECT_NEAR(u.SystemAt(1)->luminosity, 100.0, 0.1);
+}
+
+TEST_F(UniverseTest, ColourTableFollowsTheHarvardClass)
+{
+    const TempCatalogue file("o\nO5 0 1 0 0\nb\nB2 0 2 0 0\na\nA1 0 3 0 0\nf\nF5 0 4 0 0\n"
+                             "g\nG2 0 5 0 0\nk\nK0 0 6 0 0\nm\nM4 0 7 0 0\n"
+                             "w\nWN7 0 8 0 0\nr\nR3 0 9 0 0\nn\nN0 0 10 0 0\nnone\nIII 0 11 0 0\n");
+    const Universe u(file.PathString().c_str(), 1000000, 5000);
+    ASSERT_EQ(u.CountItems(), 11);
+    for (int i = 0; i < 7; i++)
+        EXPECT_EQ(u.SystemAt(i)->colorTable, Table(i)) << u.SystemAt(i)->GetName();
+    // W, R, N and no class are drawn with the G table; the star keeps its own class.
+    for (int i = 7; i < 11; i++)
+        EXPECT_EQ(u.SystemAt(i)->colorTable, Table(4)) << u.SystemAt(i)->GetName();
+    EXPECT_EQ(u.SystemAt(7)->StarAt(0)->spectralClass.harvardClass, kClassW);
+    EXPECT_EQ(u.SystemAt(8)->StarAt(0)->spectralClass.harvardClass, kClassR);
+    EXPECT_EQ(u.SystemAt(9)->StarAt(0)->spectralClass.harvardClass, kClassN);
+    EXPECT_EQ(u.SystemAt(10)->StarAt(0)->spectralClass.harvardClass, kNoClass);
+    EXPECT_STREQ(u.SystemAt(7)->StarAt(0)->GetSpectralClassString(), "WN7");
+}
+
+TEST_F(UniverseTest, WithoutSpectralTablesSystemsHaveNoTable)
+{
+    ColorTable* saved = gSpectralCTable;
+    gSpectralCTable = nullptr;
+    const TempCatalogue file("g\nG2 0 5 0 0\n");
+    const Universe u(file.PathString().c_str(), 1000000, 5000);
+    gSpectralCTable = saved;
+    ASSERT_EQ(u.CountItems(), 1);
+    EXPECT_EQ(u.SystemAt(0)->colorTable, nullptr);
+}
+
+TEST_F(UniverseTest, MaxStarsCountsRecordsNotSystems)
+{
+    const TempCatalogue file("A\nG2 1 1 1 1\nB\nG2 1 1 1 1\nC\nG2 1 2 2 2\n");
+    const Universe one(file.PathString().c_str(), 1, 5000);
+    ASSERT_EQ(one.CountItems(), 1);
+    EXPECT_EQ(one.SystemAt(0)->CountItems(), 1);
+    const Universe two(file.PathString().c_str(), 2, 5000);
+    ASSERT_EQ(two.CountItems(), 1);
+    EXPECT_EQ(two.SystemAt(0)->CountItems(), 2);
+}
+
+TEST_F(UniverseTest, NinetyCharacterNameKeepsItsFirstSeventyNine)
+{
+    std::string name;
+    for (int i = 0; i < 90; i++)
+        name += char('a' + i % 26);
+    const TempCatalogue file(name + "\nG2 1 1 1 1\n");
+    const Universe u(file.PathString().c_str(), 1000000, 5000);
+    ASSERT_EQ(u.CountItems(), 1);
+    EXPECT_EQ(std::string(u.SystemAt(0)->GetName()), name.substr(0, 79));
+    EXPECT_EQ(std::string(u.SystemAt(0)->StarAt(0)->GetName()), name.substr(0, 79));
+}
+
+TEST_F(UniverseTest, MissingFieldsKeepThePreviousRecordsValues)
+{
+    const TempCatalogue file("First\nK3V 6.5 1 2 3\nShort\nM4 11.2 7\nEmpty\n\n");
+    const Universe u(file.PathString().c_str(), 1000000, 5000);
+    ASSERT_EQ(u.CountItems(), 2);
+    const StarSystem* second = u.SystemAt(1);
+    EXPECT_EQ(second->position.x, 7);
+    EXPECT_EQ(second->position.y, 2);
+    EXPECT_EQ(second->position.z, 3);
+    ASSERT_EQ(second->CountItems(), 2);
+    EXPECT_STREQ(second->StarAt(0)->GetSpectralClassString(), "M4");
+    EXPECT_EQ(second->StarAt(0)->magnitude, 11.2);
+    // An empty data line reads nothing: the star repeats everything of the one before it.
+    EXPECT_STREQ(second->StarAt(1)->GetName(), "Empty");
+    EXPECT_STREQ(second->StarAt(1)->GetSpectralClassString(), "M4");
+    EXPECT_EQ(second->StarAt(1)->magnitude, 11.2);
+}
+
+TEST_F(UniverseTest, AnUnreadableNumberStopsTheLineThere)
+{
+    const TempCatalogue file("First\nK3V 6.5 1 2 3\nBad\nG0 4.5 x 5 6\n");
+    const Universe u(file.PathString().c_str(), 1000000, 5000);
+    ASSERT_EQ(u.CountItems(), 1); // x, y and z keep (1, 2, 3)
+    ASSERT_EQ(u.SystemAt(0)->CountItems(), 2);
+    EXPECT_EQ(u.SystemAt(0)->StarAt(1)->magnitude, 4.5);
+    EXPECT_STREQ(u.SystemAt(0)->StarAt(1)->GetSpectralClassString(), "G0");
+}
+
+TEST_F(UniverseTest, NumbersInEveryFormTheCLibraryReads)
+{
+    const TempCatalogue file("Forms\nB1 +1.5e0 0x10 -.25 1E2\n");
+    const Universe u(file.PathString().c_str(), 1000000, 5000);
+    ASSERT_EQ(u.CountItems(), 1);
+    EXPECT_EQ(u.SystemAt(0)->StarAt(0)->magnitude, 1.5);
+    EXPECT_EQ(u.SystemAt(0)->position.x, 16);
+    EXPECT_EQ(u.SystemAt(0)->position.y, -0.25);
+    EXPECT_EQ(u.SystemAt(0)->position.z, 100);
+}
+
+TEST_F(UniverseTest, LastRecordWithoutAFinalLineFeed)
+{
+    const TempCatalogue file("A\nG2 1 1 1 1\nB\nK5 2 2 2 2");
+    const Universe u(file.PathString().c_str(), 1000000, 5000);
+    ASSERT_EQ(u.CountItems(), 2);
+    EXPECT_EQ(u.SystemAt(1)->position.z, 2);
+    EXPECT_STREQ(u.SystemAt(1)->StarAt(0)->GetSpectralClassString(), "K5");
+}
+
+TEST_F(UniverseTest, MissingOrEmptyFileGivesAnEmptyUniverse)
+{
+    const Universe missing("/nonexistent/nightdome/stars.dat", 1000000, 5000);
+    EXPECT_EQ(missing.CountItems(), 0);
+    const TempCatalogue empty("");
+    EXPECT_EQ(Universe(empty.PathString().c_str(), 1000000, 5000).CountItems(), 0);
+    const Universe none(nullptr, 1000000, 5000);
+    EXPECT_EQ(none.CountItems(), 0);
+}
+
+TEST_F(UniverseTest, RelativeNamesAreFoundBesideTheExecutable)
+{
+    const TempCatalogue file("Beside\nF5 3 4 5 6\n", ExecutableDirectory());
+    const std::string name = file.Path().filename().string();
+    const Universe u(name.c_str(), 1000000, 5000);
+    ASSERT_EQ(u.CountItems(), 1);
+    EXPECT_STREQ(u.SystemAt(0)->GetName(), "Beside");
+}
+
+// A catalogue with every rule at once: multiple stars, a 90-character name, a 600-character
+// line, a record with three fields and no final line feed.
+TEST_F(UniverseTest, AWholeCatalogueReadsIntoExactlyTheseSystems)
+{
+    const std::string name90 = "HD 128620 " + std::string(80, 'x');
+    // The first 500 characters of the long line are a name line; the 501st ('#') is dropped
+    // as if it were a line feed; the remaining 99 are read as that record's data line.
+    const std::string head = "Long " + std::string(495, 'L');
+    std::string tail = "K5 7.5 3.5 -0.75 2.3";
+    tail += std::string(99 - tail.size(), ' ');
+    const std::string line600 = head + "#" + tail;
+    ASSERT_EQ(line600.size(), 600u);
+
+    const std::string text = "The Sun\nG2V 4.83 0 0 0\n"
+                             "Rigil Kentaurus\nG2V 4.38 -0.495 -1.217 -0.414\n"
+                             "Toliman\nK1V 5.71 -0.495 -1.217 -0.414\n"
+        + name90 + "\nA1V 1.42 -1.6 -0.75 2.3\n" + "Three Fields\nM4 11.2 3.5\n" + line600 + "\n"
+        + "Barnard's Star\nM4Ve 13.2 -0.01 1.03 -1.8\n" + "Last Star\nB9.5 -0.3 5 5 5";
+    const TempCatalogue file(text);
+    const Universe u(file.PathString().c_str(), 1000000, 5000);
+
+    ASSERT_EQ(u.CountItems(), 6);
+    auto lum = [](double m) { return std::pow(2.512, 4.7 - m); };
+
+    const StarSystem* sun = u.SystemAt(0);
+    EXPECT_STREQ(sun->GetName(), "The Sun");
+    EXPECT_EQ(sun->position.x, 0);
+    EXPECT_EQ(sun->CountItems(), 1);
+    EXPECT_DOUBLE_EQ(sun->luminosity, lum(4.83));
+    EXPECT_EQ(sun->colorTable, Table(4));
+
+    const StarSystem* alpha = u.SystemAt(1);
+    EXPECT_STREQ(alpha->GetName(), "Rigil Kentaurus");
+    ASSERT_EQ(alpha->CountItems(), 2);
+    EXPECT_STREQ(alpha->StarAt(1)->GetName(), "Toliman");
+    EXPECT_EQ(alpha->StarAt(1)->magnitude, 5.71);
+    EXPECT_STREQ(alpha->StarAt(1)->GetSpectralClassString(), "K1V");
+    EXPECT_DOUBLE_EQ(alpha->luminosity, lum(4.38)); // the primary's, not the companion's
+    EXPECT_EQ(alpha->position.y, -1.217);
+    EXPECT_EQ(alpha->colorTable, Table(4));
+
+    const StarSystem* sirius = u.SystemAt(2);
+    EXPECT_EQ(std::string(sirius->GetName()), name90.substr(0, 79));
+    EXPECT_DOUBLE_EQ(sirius->luminosity, lum(1.42));
+    EXPECT_EQ(sirius->colorTable, Table(2));
+
+    // Three fields: y and z carry over from the record before.
+    const StarSystem* three = u.SystemAt(3);
+    EXPECT_STREQ(three->GetName(), "Three Fields");
+    EXPECT_EQ(three->position.x, 3.5);
+    EXPECT_EQ(three->position.y, -0.75);
+    EXPECT_EQ(three->position.z, 2.3);
+    EXPECT_EQ(three->colorTable, Table(6));
+    EXPECT_DOUBLE_EQ(three->luminosity, lum(11.2));
+    // The split long line lands at the same position and joins it.
+    ASSERT_EQ(three->CountItems(), 2);
+    EXPECT_EQ(std::string(three->StarAt(1)->GetName()), head.substr(0, 79));
+    EXPECT_STREQ(three->StarAt(1)->GetSpectralClassString(), "K5");
+    EXPECT_EQ(three->StarAt(1)->magnitude, 7.5);
+
+    const StarSystem* barnard = u.SystemAt(4);
+    EXPECT_STREQ(barnard->GetName(), "Barnard's Star");
+    EXPECT_EQ(barnard->position.z, -1.8);
+    EXPECT_EQ(barnard->colorTable, Table(6));
+
+    const StarSystem* last = u.SystemAt(5);
+    EXPECT_STREQ(last->GetName(), "Last Star");
+    EXPECT_EQ(last->position.x, 5);
+    EXPECT_NEAR(last->luminosity, 100.0, 0.1);
+    EXPECT_EQ(last->colorTable, Table(1));
+    EXPECT_DOUBLE_EQ(last->StarAt(0)->spectralClass.decimalClass, 9.5);
+
+    int stars = 0;
+    for (int i = 0; i < u.CountItems(); i++)
+        stars += u.SystemAt(i)->CountItems();
+    EXPECT_EQ(stars, 8);
+}
+
+TEST_F(UniverseTest, LinesOfExactlyFiveHundredCharactersAreWhole)
+{
+    const std::string name500 = std::string(500, 'N');
+    const TempCatalogue file(name500 + "\nG2 1 1 1 1\nNext\nK2 2 2 2 2\n");
+    const Universe u(file.PathString().c_str(), 1000000, 5000);
+    ASSERT_EQ(u.CountItems(), 2);
+    EXPECT_STREQ(u.SystemAt(1)->GetName(), "Next");
+}
+
+TEST_F(UniverseTest, RecordsAcrossTheReadWindowKeepTheirPairing)
+{
+    // Enough records that the reader's window slides many times, with varied line lengths.
+    std::string text;
+    const int count = 60000;
+    for (int i = 0; i < count; i++) {
+        text += "Star " + std::to_string(i) + std::string(i % 37, '.') + "\n";
+        text += "G" + std::to_string(i % 10) + "V " + std::to_string(i % 20) + " "
+            + std::to_string(i) + ".25 " + std::to_string(-i) + " 0.5\n";
+    }
+    const TempCatalogue file(text);
+    const Universe u(file.PathString().c_str(), 1000000, 5000);
+    ASSERT_EQ(u.CountItems(), count);
+    for (int i = 0; i < count; i += 1013) {
+        const StarSystem* s = u.SystemAt(i);
+        EXPECT_EQ(std::string(s->GetName()).substr(0, 5 + std::to_string(i).size()),
+            "Star " + std::to_string(i));
+        EXPECT_EQ(s->position.x, i + 0.25);
+        EXPECT_EQ(s->position.y, -i);
+        EXPECT_EQ(s->StarAt(0)->spectralClass.decimalClass, i % 10);
+    }
+}
+
+TEST(GeneratedUniverse, CountAndPositionsFollowTheGenerator)
+{
+    // pi x 10^3 x 1 x 0.01 = 31.4: 31 systems.
+    const Universe u(10.0, kSparseDensity, 50, Random(1, 4096, 150889, 714025));
+    ASSERT_EQ(u.CountItems(), 31);
+    // Seed 1 draws 154985, 201224, 379543, ...: remainders 14985, 1224, 19543 by 20000.
+    const StarSystem* first = u.SystemAt(0);
+    EXPECT_NEAR(first->position.x, 14985 * 0.0001 * 10 - 10, 1e-12);
+    EXPECT_NEAR(first->position.y, 1224 * 0.0001 * 10 - 10, 1e-12);
+    EXPECT_NEAR(first->position.z, 19543 * 0.0001 * 10 - 10, 1e-12);
+    for (int i = 0; i < u.CountItems(); i++) {
+        const StarSystem* s = u.SystemAt(i);
+        EXPECT_STREQ(s->GetName(), "");
+        EXPECT_EQ(s->CountItems(), 0);
+        EXPECT_EQ(s->luminosity, 1.0);
+        EXPECT_EQ(s->colorTable, nullptr);
+    }
+}
+
+TEST(GeneratedUniverse, NegativeDrawsReachThreeTimesTheRadiusBelow)
+{
+    const Universe u(20.0, kDenseDensity, 5000, Random(600000, 4096, 150889, 714025));
+    ASSERT_EQ(u.CountItems(), int(3.141592653589793 * 8000 * 10 * 0.01));
+    double lowest = 0;
+    for (int i = 0; i < u.CountItems(); i++) {
+        const SVector& p = u.SystemAt(i)->position;
+        for (double c : { p.x, p.y, p.z }) {
+            EXPECT_GT(c, -3 * 20.0);
+            EXPECT_LT(c, 20.0);
+            lowest = std::min(lowest, c);
+        }
+    }
+    EXPECT_LT(lowest, -20.0); // the generator went negative somewhere
+}
