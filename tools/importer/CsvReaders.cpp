@@ -1,0 +1,290 @@
+// The two CSV inputs: the HYG database and a plain table with named columns.
+#include "tools/importer/Designations.h"
+#include "tools/importer/SourceReaders.h"
+#include "tools/importer/StrictNumbers.h"
+
+#include <algorithm>
+#include <cctype>
+#include <cmath>
+#include <initializer_list>
+#include <map>
+#include <optional>
+
+namespace {
+
+constexpr double kPi = 3.141592653589793;
+
+std::string Lower(std::string s)
+{
+    for (char& c : s)
+        c = static_cast<char>(std::tolower(static_cast<unsigned char>(c)));
+    return s;
+}
+
+std::string Trimmed(const std::string& s)
+{
+    size_t begin = 0, end = s.size();
+    while (begin < end && std::isspace(static_cast<unsigned char>(s[begin])))
+        begin++;
+    while (end > begin && std::isspace(static_cast<unsigned char>(s[end - 1])))
+        end--;
+    return s.substr(begin, end - begin);
+}
+
+// A CSV file read row by row, its columns found by name in the header.
+class CsvTable {
+public:
+    CsvTable(std::istream& in, const std::string& file)
+        : fIn(in)
+        , fFile(file)
+    {
+        std::string header;
+        if (!std::getline(fIn, header) || Trimmed(header).empty())
+            throw ImportError(fFile, 1, "no header row naming the columns");
+        fLine = 1;
+        const auto names = SplitCsvLine(StripCr(header));
+        for (size_t i = 0; i < names.size(); i++)
+            fColumns.emplace(Lower(Trimmed(names[i])), i);
+    }
+
+    // The first of the names the header has, or nothing.
+    std::optional<size_t> Find(std::initializer_list<const char*> names) const
+    {
+        for (const char* name : names) {
+            const auto found = fColumns.find(name);
+            if (found != fColumns.end())
+                return found->second;
+        }
+        return std::nullopt;
+    }
+
+    size_t Require(std::initializer_list<const char*> names, const char* what) const
+    {
+        if (const auto column = Find(names))
+            return *column;
+        std::string list;
+        for (const char* name : names)
+            list += std::string(list.empty() ? "" : " or ") + "'" + name + "'";
+        throw ImportError(
+            fFile, 1, "missing column for " + std::string(what) + ": the header needs " + list);
+    }
+
+    // The next non-blank row; false at the end.
+    bool Next()
+    {
+        std::string line;
+        while (std::getline(fIn, line)) {
+            fLine++;
+            line = StripCr(line);
+            if (Trimmed(line).empty())
+                continue;
+            fRow = SplitCsvLine(line);
+            return true;
+        }
+        if (fIn.bad())
+            throw ImportError(fFile, fLine, "read error");
+        return false;
+    }
+
+    std::string Text(std::optional<size_t> column) const
+    {
+        return column && *column < fRow.size() ? Trimmed(fRow[*column]) : std::string();
+    }
+
+    double Number(size_t column, const char* what) const
+    {
+        if (column >= fRow.size())
+            throw ImportError(fFile, fLine,
+                "row has " + std::to_string(fRow.size()) + " fields, the " + what
+                    + " column is field " + std::to_string(column + 1));
+        return StrictNumber(fRow[column], fFile, fLine, what);
+    }
+
+    // A number, or nothing when the field is empty or absent.
+    std::optional<double> OptionalNumber(std::optional<size_t> column, const char* what) const
+    {
+        if (Text(column).empty())
+            return std::nullopt;
+        return Number(*column, what);
+    }
+
+    int64_t Line() const { return fLine; }
+
+private:
+    static std::string StripCr(std::string s)
+    {
+        if (!s.empty() && s.back() == '\r')
+            s.pop_back();
+        return s;
+    }
+
+    std::istream& fIn;
+    std::string fFile;
+    std::map<std::string, size_t> fColumns;
+    std::vector<std::string> fRow;
+    int64_t fLine = 0;
+};
+
+// The spectral type as one word: blanks inside become nothing, an empty type is estimated
+// from the colour index when there is one.
+std::string SpectralWord(
+    const std::string& type, std::optional<double> colour, ImportReport& report)
+{
+    std::string word;
+    for (char c : type) {
+        if (!std::isspace(static_cast<unsigned char>(c)))
+            word += c;
+    }
+    if (!word.empty())
+        return word;
+    if (colour) {
+        report.classesFromColour++;
+        return ClassFromColour(*colour);
+    }
+    return "?";
+}
+
+} // namespace
+
+std::vector<std::string> SplitCsvLine(const std::string& line)
+{
+    std::vector<std::string> fields(1);
+    bool quoted = false;
+    for (size_t i = 0; i < line.size(); i++) {
+        const char c = line[i];
+        if (quoted) {
+            if (c == '"' && i + 1 < line.size() && line[i + 1] == '"') {
+                fields.back() += '"';
+                i++;
+            } else if (c == '"') {
+                quoted = false;
+            } else {
+                fields.back() += c;
+            }
+        } else if (c == '"') {
+            quoted = true;
+        } else if (c == ',') {
+            fields.emplace_back();
+        } else {
+            fields.back() += c;
+        }
+    }
+    return fields;
+}
+
+void ReadHyg(
+    std::istream& in, const std::string& file, std::vector<ImportStar>& stars, ImportReport& report)
+{
+    CsvTable table(in, file);
+    const size_t ra = table.Require({ "ra" }, "right ascension (hours)");
+    const size_t dec = table.Require({ "dec" }, "declination (degrees)");
+    const size_t dist = table.Require({ "dist" }, "distance (parsecs)");
+    const auto absmag = table.Find({ "absmag" });
+    const auto mag = table.Find({ "mag" });
+    if (!absmag && !mag)
+        table.Require({ "absmag", "mag" }, "magnitude");
+    const auto spect = table.Find({ "spect" });
+    const auto colour = table.Find({ "ci" });
+    const auto proper = table.Find({ "proper" });
+    const auto bf = table.Find({ "bf" });
+    const auto gl = table.Find({ "gl" });
+    const auto hip = table.Find({ "hip" });
+    const auto hd = table.Find({ "hd" });
+
+    while (table.Next()) {
+        report.read++;
+        const double distance = table.Number(dist, "dist");
+        const double raHours = table.Number(ra, "ra");
+        const double decDegrees = table.Number(dec, "dec");
+        if (Lower(table.Text(proper)) == "sol" || distance == 0) {
+            report.Skip("the Sun (always written first)");
+            continue;
+        }
+        // HYG marks stars without a parallax with a distance of 100000 pc.
+        if (!(distance > 0) || distance >= 100000) {
+            report.Skip("without a usable parallax");
+            continue;
+        }
+        ImportStar star;
+        star.line = table.Line();
+        star.ra = raHours / 24 * 2 * kPi;
+        star.dec = decDegrees / 180 * kPi;
+        star.parallax = 1000.0 / distance;
+        if (const auto m = table.OptionalNumber(absmag, "absmag"))
+            star.absoluteMagnitude = *m;
+        else if (const auto v = table.OptionalNumber(mag, "mag"))
+            star.absoluteMagnitude = *v + 5 - 5 * std::log10(distance);
+        else
+            throw ImportError(file, table.Line(), "no magnitude (both absmag and mag are empty)");
+        star.spectralClass
+            = SpectralWord(table.Text(spect), table.OptionalNumber(colour, "ci"), report);
+
+        std::string name = CleanName(table.Text(proper));
+        if (name.empty())
+            name = CleanName(ReadableDesignation(table.Text(bf)));
+        if (name.empty() && !table.Text(gl).empty())
+            name = CleanName(table.Text(gl));
+        if (name.empty() && !table.Text(hip).empty())
+            name = "HIP " + table.Text(hip);
+        if (name.empty() && !table.Text(hd).empty())
+            name = "HD " + table.Text(hd);
+        if (name.empty())
+            name = PositionDesignation(star.ra, star.dec);
+        star.name = name;
+        stars.push_back(std::move(star));
+    }
+}
+
+void ReadPlainCsv(
+    std::istream& in, const std::string& file, std::vector<ImportStar>& stars, ImportReport& report)
+{
+    CsvTable table(in, file);
+    const auto name = table.Find({ "name", "designation", "source_id", "id" });
+    const size_t ra = table.Require({ "ra", "ra_deg" }, "right ascension (degrees)");
+    const size_t dec = table.Require({ "dec", "dec_deg" }, "declination (degrees)");
+    const auto parallax = table.Find({ "parallax", "plx", "parallax_mas" });
+    const auto distance = table.Find({ "distance", "dist", "distance_pc" });
+    if (!parallax && !distance)
+        table.Require({ "parallax", "distance" }, "distance");
+    const auto mag = table.Find({ "mag", "vmag", "v" });
+    const auto absmag = table.Find({ "absmag", "abs_mag" });
+    if (!mag && !absmag)
+        table.Require({ "mag", "absmag" }, "magnitude");
+    const auto spect = table.Find({ "spect", "sptype", "spectral_type", "spectral_class" });
+    const auto colour = table.Find({ "bv", "b-v", "ci" });
+
+    while (table.Next()) {
+        report.read++;
+        const double raDegrees = table.Number(ra, "ra");
+        const double decDegrees = table.Number(dec, "dec");
+        if (raDegrees < 0 || raDegrees >= 360 || decDegrees < -90 || decDegrees > 90)
+            throw ImportError(
+                file, table.Line(), "position out of range (ra 0..360, dec -90..90 degrees)");
+        double plx = 0;
+        if (const auto p = table.OptionalNumber(parallax, "parallax"))
+            plx = *p;
+        else if (const auto d = table.OptionalNumber(distance, "distance"))
+            plx = *d > 0 ? 1000.0 / *d : 0;
+        if (!(plx > 0)) {
+            report.Skip("without a usable parallax");
+            continue;
+        }
+        ImportStar star;
+        star.line = table.Line();
+        star.ra = raDegrees / 180 * kPi;
+        star.dec = decDegrees / 180 * kPi;
+        star.parallax = plx;
+        if (const auto m = table.OptionalNumber(absmag, "absmag"))
+            star.absoluteMagnitude = *m;
+        else if (const auto v = table.OptionalNumber(mag, "mag"))
+            star.absoluteMagnitude = *v + 5 + 5 * std::log10(plx / 1000);
+        else
+            throw ImportError(file, table.Line(), "no magnitude");
+        star.spectralClass
+            = SpectralWord(table.Text(spect), table.OptionalNumber(colour, "bv"), report);
+        star.name = CleanName(table.Text(name));
+        if (star.name.empty())
+            star.name = PositionDesignation(star.ra, star.dec);
+        stars.push_back(std::move(star));
+    }
+}

@@ -1,0 +1,260 @@
+// Greek letters, constellation genitives and position designations.
+#include "tools/importer/Designations.h"
+
+#include <cctype>
+#include <cmath>
+#include <cstdio>
+#include <cstring>
+#include <utility>
+
+namespace {
+
+constexpr std::pair<const char*, const char*> kGreek[] = {
+    { "alp", "Alpha" },
+    { "bet", "Beta" },
+    { "gam", "Gamma" },
+    { "del", "Delta" },
+    { "eps", "Epsilon" },
+    { "zet", "Zeta" },
+    { "eta", "Eta" },
+    { "the", "Theta" },
+    { "iot", "Iota" },
+    { "kap", "Kappa" },
+    { "lam", "Lambda" },
+    { "omi", "Omicron" },
+    { "rho", "Rho" },
+    { "sig", "Sigma" },
+    { "tau", "Tau" },
+    { "ups", "Upsilon" },
+    { "phi", "Phi" },
+    { "chi", "Chi" },
+    { "psi", "Psi" },
+    { "ome", "Omega" },
+    { "mu", "Mu" },
+    { "nu", "Nu" },
+    { "xi", "Xi" },
+    { "pi", "Pi" },
+};
+
+constexpr std::pair<const char*, const char*> kConstellations[] = {
+    { "And", "Andromedae" },
+    { "Ant", "Antliae" },
+    { "Aps", "Apodis" },
+    { "Aqr", "Aquarii" },
+    { "Aql", "Aquilae" },
+    { "Ara", "Arae" },
+    { "Ari", "Arietis" },
+    { "Aur", "Aurigae" },
+    { "Boo", "Bootis" },
+    { "Cae", "Caeli" },
+    { "Cam", "Camelopardalis" },
+    { "Cnc", "Cancri" },
+    { "CVn", "Canum Venaticorum" },
+    { "CMa", "Canis Majoris" },
+    { "CMi", "Canis Minoris" },
+    { "Cap", "Capricorni" },
+    { "Car", "Carinae" },
+    { "Cas", "Cassiopeiae" },
+    { "Cen", "Centauri" },
+    { "Cep", "Cephei" },
+    { "Cet", "Ceti" },
+    { "Cha", "Chamaeleontis" },
+    { "Cir", "Circini" },
+    { "Col", "Columbae" },
+    { "Com", "Comae Berenices" },
+    { "CrA", "Coronae Australis" },
+    { "CrB", "Coronae Borealis" },
+    { "Crv", "Corvi" },
+    { "Crt", "Crateris" },
+    { "Cru", "Crucis" },
+    { "Cyg", "Cygni" },
+    { "Del", "Delphini" },
+    { "Dor", "Doradus" },
+    { "Dra", "Draconis" },
+    { "Equ", "Equulei" },
+    { "Eri", "Eridani" },
+    { "For", "Fornacis" },
+    { "Gem", "Geminorum" },
+    { "Gru", "Gruis" },
+    { "Her", "Herculis" },
+    { "Hor", "Horologii" },
+    { "Hya", "Hydrae" },
+    { "Hyi", "Hydri" },
+    { "Ind", "Indi" },
+    { "Lac", "Lacertae" },
+    { "Leo", "Leonis" },
+    { "LMi", "Leonis Minoris" },
+    { "Lep", "Leporis" },
+    { "Lib", "Librae" },
+    { "Lup", "Lupi" },
+    { "Lyn", "Lyncis" },
+    { "Lyr", "Lyrae" },
+    { "Men", "Mensae" },
+    { "Mic", "Microscopii" },
+    { "Mon", "Monocerotis" },
+    { "Mus", "Muscae" },
+    { "Nor", "Normae" },
+    { "Oct", "Octantis" },
+    { "Oph", "Ophiuchi" },
+    { "Ori", "Orionis" },
+    { "Pav", "Pavonis" },
+    { "Peg", "Pegasi" },
+    { "Per", "Persei" },
+    { "Phe", "Phoenicis" },
+    { "Pic", "Pictoris" },
+    { "Psc", "Piscium" },
+    { "PsA", "Piscis Austrini" },
+    { "Pup", "Puppis" },
+    { "Pyx", "Pyxidis" },
+    { "Ret", "Reticuli" },
+    { "Sge", "Sagittae" },
+    { "Sgr", "Sagittarii" },
+    { "Sco", "Scorpii" },
+    { "Scl", "Sculptoris" },
+    { "Sct", "Scuti" },
+    { "Ser", "Serpentis" },
+    { "Sex", "Sextantis" },
+    { "Tau", "Tauri" },
+    { "Tel", "Telescopii" },
+    { "Tri", "Trianguli" },
+    { "TrA", "Trianguli Australis" },
+    { "Tuc", "Tucanae" },
+    { "UMa", "Ursae Majoris" },
+    { "UMi", "Ursae Minoris" },
+    { "Vel", "Velorum" },
+    { "Vir", "Virginis" },
+    { "Vol", "Volantis" },
+    { "Vul", "Vulpeculae" },
+};
+
+bool EqualsIgnoringCase(const std::string& a, const char* b)
+{
+    const size_t n = std::strlen(b);
+    if (a.size() != n)
+        return false;
+    for (size_t i = 0; i < n; i++) {
+        if (std::tolower(static_cast<unsigned char>(a[i]))
+            != std::tolower(static_cast<unsigned char>(b[i])))
+            return false;
+    }
+    return true;
+}
+
+bool IsAlpha(char c)
+{
+    return std::isalpha(static_cast<unsigned char>(c)) != 0;
+}
+
+bool IsDigit(char c)
+{
+    return c >= '0' && c <= '9';
+}
+
+} // namespace
+
+std::string ConstellationGenitive(const std::string& abbreviation)
+{
+    for (const auto& [abbr, genitive] : kConstellations) {
+        if (abbreviation == abbr)
+            return genitive;
+    }
+    // "CMA" or "cma" still mean Canis Major; only "CrA"/"Cra"-like pairs would be ambiguous, and
+    // those differ in more than case ("CrA" and "Crt").
+    for (const auto& [abbr, genitive] : kConstellations) {
+        if (EqualsIgnoringCase(abbreviation, abbr))
+            return genitive;
+    }
+    return {};
+}
+
+std::string ReadableDesignation(const std::string& designation)
+{
+    const std::string& s = designation;
+    size_t i = 0;
+    auto skipBlanks = [&] {
+        while (i < s.size() && s[i] == ' ')
+            i++;
+    };
+
+    skipBlanks();
+    std::string flamsteed;
+    while (i < s.size() && IsDigit(s[i]))
+        flamsteed += s[i++];
+    skipBlanks();
+
+    std::string greek;
+    for (const auto& [abbr, letter] : kGreek) {
+        const size_t n = std::strlen(abbr);
+        if (i + n <= s.size() && EqualsIgnoringCase(s.substr(i, n), abbr)
+            && (i + n == s.size() || !IsAlpha(s[i + n])
+                || std::isupper(static_cast<unsigned char>(s[i + n])))) {
+            // "alpCen" has no blank; the capital of the constellation ends the letter.
+            greek = letter;
+            i += n;
+            break;
+        }
+    }
+    if (!greek.empty()) {
+        skipBlanks();
+        while (i < s.size() && IsDigit(s[i]))
+            greek += s[i++];
+    }
+    skipBlanks();
+
+    std::string rest = s.substr(i);
+    while (!rest.empty() && rest.back() == ' ')
+        rest.pop_back();
+    const std::string genitive = ConstellationGenitive(rest);
+    if (genitive.empty())
+        return {};
+    if (!greek.empty())
+        return greek + " " + genitive;
+    if (!flamsteed.empty())
+        return flamsteed + " " + genitive;
+    return {};
+}
+
+std::string PositionDesignation(double ra, double dec)
+{
+    constexpr double kTurn = 2 * 3.141592653589793;
+    double hours = std::fmod(ra, kTurn) / kTurn * 24.0;
+    if (hours < 0)
+        hours += 24.0;
+    // Whole tenths of a second of time and whole arc-seconds, so that nothing rounds up to 60.
+    auto tenths = static_cast<long>(std::floor(hours * 36000.0 + 0.5)) % 864000;
+    const long h = tenths / 36000, m = tenths / 600 % 60, secondTenths = tenths % 600;
+    const double degrees = dec * 180.0 / 3.141592653589793;
+    const long arcseconds = static_cast<long>(std::floor(std::fabs(degrees) * 3600.0 + 0.5));
+    char text[96];
+    std::snprintf(text, sizeof text, "J%02ld%02ld%02ld.%ld%c%02ld%02ld%02ld", h, m,
+        secondTenths / 10, secondTenths % 10, degrees < 0 ? '-' : '+', arcseconds / 3600,
+        arcseconds / 60 % 60, arcseconds % 60);
+    return text;
+}
+
+std::string CleanName(const std::string& name)
+{
+    std::string out;
+    bool blank = false;
+    for (char c : name) {
+        const bool control = static_cast<unsigned char>(c) < 32 || c == 127;
+        if (c == ' ' || control) {
+            blank = !out.empty();
+            continue;
+        }
+        if (blank)
+            out += ' ';
+        blank = false;
+        out += c;
+    }
+    if (out.size() > 79) {
+        size_t cut = 79;
+        // Step back over UTF-8 continuation bytes so no character is split.
+        while (cut > 0 && (static_cast<unsigned char>(out[cut]) & 0xC0) == 0x80)
+            cut--;
+        out.resize(cut);
+        while (!out.empty() && out.back() == ' ')
+            out.pop_back();
+    }
+    return out;
+}

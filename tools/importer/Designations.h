@@ -1,0 +1,23 @@
+// Star names the program can show: readable Bayer and Flamsteed designations, designations
+// built from a position, and the clean-up every written name goes through.
+#pragma once
+
+#include <string>
+
+// "alp CMa" -> "Alpha Canis Majoris", "alp1Cen" and "Alp2Cen" -> "Alpha1 Centauri" and
+// "Alpha2 Centauri", "pi 2Col" -> "Pi2 Columbae", "61 Cyg" -> "61 Cygni", "9Alp CMa" -> "Alpha
+// Canis Majoris" (the Greek letter is preferred to the Flamsteed number). Empty when the text
+// is no designation of this kind.
+std::string ReadableDesignation(const std::string& designation);
+
+// The genitive of a constellation's three-letter abbreviation ("Cyg" -> "Cygni"); empty when
+// unknown. Case matters only where it tells two constellations apart.
+std::string ConstellationGenitive(const std::string& abbreviation);
+
+// "J064508.9-164258": right ascension in hours, minutes and tenths of seconds, declination in
+// degrees, arc-minutes and arc-seconds, for an equinox J2000 position in radians.
+std::string PositionDesignation(double ra, double dec);
+
+// A name as the catalogue file can hold it: control characters become blanks, runs of blanks
+// one blank, no blanks at either end, at most 79 bytes (never cutting a UTF-8 character).
+std::string CleanName(const std::string& name);

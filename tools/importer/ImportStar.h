@@ -1,0 +1,49 @@
+// What the importer knows of one star, whatever catalogue it came from, and how it reports
+// trouble with its input.
+#pragma once
+
+#include <cstdint>
+#include <map>
+#include <stdexcept>
+#include <string>
+
+struct ImportStar {
+    std::string name; // as written: at most 79 characters, no line feeds
+    double ra = 0; // right ascension, radians
+    double dec = 0; // declination, radians
+    double parallax = 0; // milliarcseconds, > 0
+    double absoluteMagnitude = 0;
+    std::string spectralClass; // one word without blanks
+    int64_t line = 0; // where the star stood in its source, for messages
+    // Stars with the same group number of 0 or more are one system as they stand; -1 leaves
+    // the grouping to the sky-and-parallax rule.
+    int64_t group = -1;
+};
+
+// What the importer did with its input: stars read, and the ones left out, by reason.
+struct ImportReport {
+    std::string source; // file name, or a description of generated data
+    std::string format;
+    int64_t read = 0;
+    std::map<std::string, int64_t> skipped; // reason -> count
+    int64_t classesFromColour = 0; // spectral class estimated from the B-V colour index
+
+    int64_t Skipped() const;
+    void Skip(const std::string& reason) { skipped[reason]++; }
+};
+
+// Bad input: names the file, the line (0 when the trouble is the whole file) and the reason.
+class ImportError : public std::runtime_error {
+public:
+    ImportError(const std::string& file, int64_t line, const std::string& reason);
+
+    std::string file;
+    int64_t line;
+    std::string reason;
+};
+
+// Distance in parsecs for a parallax in milliarcseconds.
+inline double ParsecsFromParallax(double parallaxMas)
+{
+    return 1000.0 / parallaxMas;
+}

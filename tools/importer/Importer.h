@@ -1,0 +1,36 @@
+// One import from start to end: read a catalogue (or generate one), group the stars into
+// systems, write the program's catalogue, and describe what was done.
+#pragma once
+
+#include "tools/importer/ImportStar.h"
+#include "tools/importer/SystemGrouping.h"
+
+#include <string>
+
+enum class InputFormat { Guess, KStars, Hyg, Csv };
+
+struct ImportOptions {
+    InputFormat format = InputFormat::Guess;
+    std::string input; // the catalogue to read; unused when generating
+    std::string output = "stars.dat";
+    int64_t generate = -1; // a synthetic catalogue of this many stars instead of input
+    uint64_t seed = 1;
+};
+
+struct ImportResult {
+    ImportReport report;
+    WriteSummary summary;
+};
+
+// Throws ImportError for bad input or output; the output file is then as it was.
+ImportResult RunImport(const ImportOptions& options);
+
+// The format of a catalogue from its first line: '#' comments or fixed columns mean kstars, a
+// header with "hip", "dist" and "absmag" means HYG, another header with commas a plain CSV.
+InputFormat GuessFormat(const std::string& firstLine);
+
+// What was read, skipped (by reason) and written (systems by number of members).
+std::string DescribeImport(const ImportResult& result);
+
+// The help text of the command.
+std::string ImporterHelp();

@@ -1,0 +1,41 @@
+// Turning a list of stars into star systems, and writing them as the program's catalogue.
+#pragma once
+
+#include "tools/importer/ImportStar.h"
+
+#include <string>
+#include <vector>
+
+// Two stars are one system when they lie close together on the sky, at most
+// kMaxSeparationAU apart across the line of sight at their mean distance, and their
+// parallaxes agree within three combined errors, each star's error taken as the larger of
+// 1 mas and 2% of its parallax (the catalogues carry no errors of their own). Pairs chain:
+// a star close to either component joins the system.
+inline constexpr double kMaxSeparationAU = 5000.0;
+
+struct StarGroup {
+    std::vector<size_t> members; // indices into the star list, brightest first
+};
+
+// Stars that share a group number of 0 or more are one system as they stand; the rest are
+// grouped by the rule above. Systems come in the order of their first star in the list.
+std::vector<StarGroup> GroupSystems(const std::vector<ImportStar>& stars);
+
+// Whether the rule above makes one system of a and b.
+bool SameSystem(const ImportStar& a, const ImportStar& b);
+
+// Position in parsecs in the program's frame: x toward right ascension 0 h, z toward 6 h,
+// y toward the north celestial pole.
+void CartesianPosition(const ImportStar& star, double* x, double* y, double* z);
+
+struct WriteSummary {
+    int64_t systems = 0; // the Sun included
+    int64_t stars = 0; // the Sun included
+    std::vector<int64_t> systemsBySize; // [n] = systems of n stars
+};
+
+// Writes "The Sun" first, then every system with its stars at the position of its primary.
+// The text goes to a temporary file beside path that replaces path only when all is written,
+// so a failed run never leaves a partial catalogue. Throws ImportError when it cannot write.
+WriteSummary WriteCatalogue(const std::string& path, const std::vector<ImportStar>& stars,
+    const std::vector<StarGroup>& systems);

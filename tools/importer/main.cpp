@@ -1,0 +1,93 @@
+// nightdome-import: writes the program's star catalogue from a published one.
+#include "tools/importer/Importer.h"
+
+#include <cstdio>
+#include <cstring>
+#include <iostream>
+#include <string>
+
+namespace {
+
+bool Value(const std::string& arg, const char* option, std::string* value)
+{
+    const size_t n = std::strlen(option);
+    if (arg.compare(0, n, option) == 0 && arg.size() > n && arg[n] == '=') {
+        *value = arg.substr(n + 1);
+        return true;
+    }
+    return false;
+}
+
+int Usage(const std::string& problem)
+{
+    std::cerr << "nightdome-import: " << problem << "\n(see nightdome-import --help)\n";
+    return 2;
+}
+
+} // namespace
+
+int main(int argc, char** argv)
+{
+    ImportOptions options;
+    bool quiet = false;
+    std::string value;
+    for (int i = 1; i < argc; i++) {
+        const std::string arg = argv[i];
+        if (arg == "-h" || arg == "--help") {
+            std::cout << ImporterHelp();
+            return 0;
+        } else if (arg == "-q" || arg == "--quiet") {
+            quiet = true;
+        } else if (arg == "-o" || arg == "--output") {
+            if (++i == argc)
+                return Usage(arg + " needs a file name");
+            options.output = argv[i];
+        } else if (Value(arg, "--output", &value)) {
+            options.output = value;
+        } else if (Value(arg, "--format", &value)) {
+            if (value == "kstars")
+                options.format = InputFormat::KStars;
+            else if (value == "hyg")
+                options.format = InputFormat::Hyg;
+            else if (value == "csv")
+                options.format = InputFormat::Csv;
+            else
+                return Usage("unknown format '" + value + "' (kstars, hyg or csv)");
+        } else if (Value(arg, "--generate", &value)) {
+            try {
+                options.generate = std::stoll(value);
+            } catch (...) {
+                options.generate = -1;
+            }
+            if (options.generate < 0)
+                return Usage("--generate needs a star count, not '" + value + "'");
+        } else if (Value(arg, "--seed", &value)) {
+            try {
+                options.seed = std::stoull(value);
+            } catch (...) {
+                return Usage("--seed needs a whole number, not '" + value + "'");
+            }
+        } else if (!arg.empty() && arg[0] == '-') {
+            return Usage("unknown option " + arg);
+        } else if (options.input.empty()) {
+            options.input = arg;
+        } else {
+            return Usage("only one input catalogue, please");
+        }
+    }
+    if (options.generate < 0 && options.input.empty())
+        return Usage("no input catalogue given");
+
+    try {
+        const ImportResult result = RunImport(options);
+        if (!quiet)
+            std::cout << DescribeImport(result) << "Catalogue written to " << options.output
+                      << "\n";
+    } catch (const ImportError& error) {
+        std::cerr << "nightdome-import: " << error.what() << "\n";
+        if (options.generate < 0)
+            std::cerr << "nightdome-import: " << options.output << " was not changed.\n";
+        return 1;
+    }
+    return 0;
+}
