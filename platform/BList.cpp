@@ -43,11 +43,6 @@ int32_t BList::CapacityFor(int32_t count) const
     return std::max<int32_t>(2, static_cast<int32_t>(std::bit_ceil(blocks)) * fBlockSize);
 }
 
-void** BList::Items() const
-{
-    return fCount > 1 ? fArray : const_cast<void**>(&fSingle);
-}
-
 // Moves the storage to the size newCount needs; the items up to min(old, new) count are kept.
 void BList::Resize(int32_t newCount)
 {
@@ -149,13 +144,6 @@ void BList::MakeEmpty()
         std::free(fArray);
     fSingle = nullptr;
     fCount = 0;
-}
-
-void* BList::ItemAt(int32_t index) const
-{
-    if (index < 0 || index >= fCount)
-        return nullptr;
-    return Items()[index];
 }
 
 int32_t BList::IndexOf(const void* item) const

@@ -26,7 +26,11 @@ public:
     bool SwapItems(int32_t a, int32_t b);
     void MakeEmpty();
 
-    void* ItemAt(int32_t index) const; // null outside the range
+    // Null outside the range. Inline: queries and renderers call it for every system.
+    void* ItemAt(int32_t index) const
+    {
+        return index >= 0 && index < fCount ? Items()[index] : nullptr;
+    }
     void* ItemAtFast(int32_t index) const { return Items()[index]; }
     void* FirstItem() const { return ItemAt(0); }
     void* LastItem() const { return ItemAt(fCount - 1); }
@@ -35,7 +39,7 @@ public:
     int32_t CountItems() const { return fCount; }
     bool IsEmpty() const { return fCount == 0; }
     // The items, contiguous; valid until the list changes.
-    void** Items() const;
+    void** Items() const { return fCount > 1 ? fArray : const_cast<void**>(&fSingle); }
     void SortItems(int (*compare)(const void*, const void*));
 
     // Slots the list has room for before it must grow again.

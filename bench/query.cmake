@@ -1,0 +1,1 @@
+nd_bench(query SOURCES QueryBench.cpp LIBS nd_query)

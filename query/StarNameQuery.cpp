@@ -1,0 +1,131 @@
+// The name tests. Without regard to case, both the search text and each name are lower-cased
+// with the C library's tolower into the two buffers made once with the query, so a run over a
+// million systems allocates nothing.
+#include "query/StarNameQuery.h"
+
+#include "catalog/Universe.h"
+
+#include <cassert>
+#include <cctype>
+#include <cstdlib>
+#include <cstring>
+
+namespace {
+
+// Copies text, its NUL included, lower-cased into buffer.
+void LowerCopy(char* buffer, const char* text)
+{
+    for (int32_t i = 0;; i++) {
+        const char c = text[i];
+        buffer[i] = static_cast<char>(std::tolower(static_cast<unsigned char>(c)));
+        if (c == '\0')
+            return;
+    }
+}
+
+} // namespace
+
+StarNameQuery::StarNameQuery(Universe* universe)
+    : StarSysQuery(universe)
+    , nameBuffer(static_cast<char*>(std::malloc(kNameBufferSize)))
+    , patternBuffer(static_cast<char*>(std::malloc(kNameBufferSize)))
+    , pattern(patternBuffer)
+    , candidate(nameBuffer)
+    , patternLength(0)
+{
+    nameBuffer[0] = '\0';
+    patternBuffer[0] = '\0';
+}
+
+StarNameQuery::~StarNameQuery()
+{
+    std::free(nameBuffer);
+    std::free(patternBuffer);
+}
+
+int32_t StarNameQuery::GetSysMask(StarSysMask* mask, void* param)
+{
+    const auto* p = static_cast<const NameQueryParam*>(param);
+    patternLength = static_cast<int32_t>(std::strlen(p->text));
+    assert(patternLength < kNameBufferSize);
+    if (p->caseSensitive) {
+        pattern = p->text;
+    } else {
+        LowerCopy(patternBuffer, p->text);
+        pattern = patternBuffer;
+    }
+    return StarSysQuery::GetSysMask(mask, param);
+}
+
+bool StarNameQuery::Query(int32_t index, void* param)
+{
+    void* const* systems = Systems();
+    PrefetchMembers(systems, index + 2 * kPrefetchAhead);
+    PrefetchFirstStar(systems, index + kPrefetchAhead);
+    const auto* p = static_cast<const NameQueryParam*>(param);
+    const StarSystem* system = static_cast<const StarSystem*>(systems[index]);
+    const int32_t members = system->CountItems();
+    for (int32_t i = 0; i < members; i++) {
+        const char* name = static_cast<const GravSystem*>(system->ItemAtFast(i))->GetName();
+        if (p->caseSensitive) {
+            candidate = name;
+        } else {
+            LowerCopy(nameBuffer, name);
+            candidate = nameBuffer;
+        }
+        bool match;
+        switch (p->mode) {
+        case kNameIs:
+            match = Is();
+            break;
+        case kNameContains:
+            match = Contains();
+            break;
+        case kNameStartsWith:
+            match = StartsWith();
+            break;
+        default:
+            return false;
+        }
+        if (match)
+            return true;
+    }
+    return false;
+}
+
+// The bytes up to and including the pattern's NUL agree: the whole name equals the pattern.
+// A shorter name differs at its own NUL, so no byte after it is read.
+bool StarNameQuery::Is() const
+{
+    for (int32_t k = 0; k <= patternLength; k++) {
+        if (pattern[k] != candidate[k])
+            return false;
+    }
+    return true;
+}
+
+// The first patternLength bytes agree; an empty pattern starts every name.
+bool StarNameQuery::StartsWith() const
+{
+    for (int32_t k = 0; k < patternLength; k++) {
+        if (pattern[k] != candidate[k])
+            return false;
+    }
+    return true;
+}
+
+// The pattern is found at some start position of a non-empty name; an empty pattern is found
+// in every non-empty name and in no empty one. Comparing at a start position stops at the
+// first differing byte: pattern bytes are never NUL, so a window that runs past the name's end
+// differs at the name's NUL and could not match anyway.
+bool StarNameQuery::Contains() const
+{
+    for (int32_t s = 0; candidate[s] != '\0'; s++) {
+        int32_t k = 0;
+        while (k < patternLength && pattern[k] == candidate[s + k])
+            k++;
+        if (k == patternLength)
+            return true;
+    }
+    return false;
+}
