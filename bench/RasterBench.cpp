@@ -1,5 +1,6 @@
 // RasterBench.cpp: additive point writes and 64 x 64 additive glow blits, the fast kernel
 // against the plain reference.
+#include "core/MessageCodes.h"
 #include "platform/Resources.h"
 #include "render/RBitmap8.h"
 #include "resources/ResourceData.h"
@@ -19,7 +20,7 @@ struct Fixture {
         , table(static_cast<ColorTable*>(std::malloc(sizeof(ColorTable))))
     {
         InitResources();
-        glow.LoadFromResource(int32_t(ResourceType("Raw8")), 5, 0, 4096);
+        glow.LoadFromResource(int32_t(kRaw8Type), 5, 0, 4096);
         std::mt19937 random(7);
         for (int i = 0; i < 256; ++i)
             table->colors[i] = { uint8_t(i * 3 / 4), uint8_t(i * 3 / 4), uint8_t(i), 0 };

@@ -8,16 +8,10 @@
 // registers them here; the resource generator registers the committed font strip itself.
 #pragma once
 
+#include "platform/FourCC.h"
+
 #include <cstddef>
 #include <cstdint>
-
-// A four-character type code, most significant character first: ResourceType("Raw8") is
-// 0x52617738.
-constexpr uint32_t ResourceType(const char (&code)[5])
-{
-    return (uint32_t(uint8_t(code[0])) << 24) | (uint32_t(uint8_t(code[1])) << 16)
-        | (uint32_t(uint8_t(code[2])) << 8) | uint32_t(uint8_t(code[3]));
-}
 
 // Makes size bytes at data the resource (type, id), replacing any earlier block of that key.
 // The bytes are not copied: data must stay valid (unchanged) for the rest of the run.

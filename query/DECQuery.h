@@ -2,6 +2,7 @@
 // [-pi/2, pi/2].
 #pragma once
 
+#include "core/MessageCodes.h"
 #include "query/StarSysQuery.h"
 
 // Doubles in the records follow the 32-bit fields on a 4-byte boundary, as the panels lay
@@ -15,7 +16,7 @@ struct DECQueryParam {
 
 class DECQuery final : public StarSysQuery {
 public:
-    static constexpr uint32_t kType = 0x44454379; // 'DECy'
+    static constexpr uint32_t kType = kDeclinationQueryType;
     // "is" accepts angles this close to the target, either side included; radians.
     static constexpr double kTolerance = 0.02;
 

@@ -1,6 +1,7 @@
 // Finds systems by their distance from the origin or from another system.
 #pragma once
 
+#include "core/MessageCodes.h"
 #include "core/SVector.h"
 #include "query/StarSysQuery.h"
 
@@ -16,7 +17,7 @@ struct DistanceQueryParam {
 
 class DistanceQuery final : public StarSysQuery {
 public:
-    static constexpr uint32_t kType = 0x44697374; // 'Dist'
+    static constexpr uint32_t kType = kDistanceQueryType;
     // "is" accepts distances this close to the target, either side included; parsecs.
     static constexpr double kTolerance = 0.3;
 

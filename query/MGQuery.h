@@ -1,6 +1,7 @@
 // Finds systems by the absolute magnitude of their stars.
 #pragma once
 
+#include "core/MessageCodes.h"
 #include "query/StarSysQuery.h"
 
 // Doubles in the records follow the 32-bit fields on a 4-byte boundary, as the panels lay
@@ -15,7 +16,7 @@ struct MGQueryParam {
 
 class MGQuery final : public StarSysQuery {
 public:
-    static constexpr uint32_t kType = 0x4d477179; // 'MGqy'
+    static constexpr uint32_t kType = kMagnitudeQueryType;
     // "is" accepts magnitudes this close to the target, either side included.
     static constexpr double kTolerance = 0.05;
 

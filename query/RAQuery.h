@@ -2,6 +2,7 @@
 // toward +z, in [0, 2 pi).
 #pragma once
 
+#include "core/MessageCodes.h"
 #include "query/StarSysQuery.h"
 
 // Doubles in the records follow the 32-bit fields on a 4-byte boundary, as the panels lay
@@ -15,7 +16,7 @@ struct RAQueryParam {
 
 class RAQuery final : public StarSysQuery {
 public:
-    static constexpr uint32_t kType = 0x52417179; // 'RAqy'
+    static constexpr uint32_t kType = kRightAscensionQueryType;
     // "is" accepts angles this close to the target, either side included; radians. The
     // window does not wrap around 0.
     static constexpr double kTolerance = 0.015;

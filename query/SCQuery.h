@@ -1,6 +1,7 @@
 // Finds systems by the spectral class of their stars, on SpectralClass's numeric scale.
 #pragma once
 
+#include "core/MessageCodes.h"
 #include "query/StarSysQuery.h"
 
 class SpectralClass;
@@ -13,7 +14,7 @@ struct SCQueryParam {
 
 class SCQuery final : public StarSysQuery {
 public:
-    static constexpr uint32_t kType = 0x53437179; // 'SCqy'
+    static constexpr uint32_t kType = kSpectralClassQueryType;
 
     explicit SCQuery(Universe* universe);
     ~SCQuery() override;

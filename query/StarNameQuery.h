@@ -2,6 +2,7 @@
 // with or without regard to case.
 #pragma once
 
+#include "core/MessageCodes.h"
 #include "query/StarSysQuery.h"
 
 // Name modes.
@@ -19,7 +20,7 @@ struct NameQueryParam {
 
 class StarNameQuery final : public StarSysQuery {
 public:
-    static constexpr uint32_t kType = 0x6e616d65; // 'name'
+    static constexpr uint32_t kType = kNameQueryType;
     // Bytes of each lower-casing buffer, the terminating NUL included. Nothing checks lengths:
     // names hold at most 80 bytes and search texts must stay below this size.
     static constexpr int32_t kNameBufferSize = 1024;

@@ -171,41 +171,44 @@ void RBitmap8::RenderSquareAdd(
     }
 }
 
+namespace {
+
+// The clipping of a horizontal or vertical run along an axis of extent pixels: a negative
+// length runs back from start; a run wholly before the edge or from past the far edge is
+// dropped; a run starting before the edge is moved to it with its length kept (deliberately not
+// shortened), then cut at the far edge. False when nothing is left to draw.
+bool ClipRun(int32_t from, int32_t length, int32_t extent, int64_t* start, int64_t* run)
+{
+    *start = from;
+    *run = length;
+    if (*run < 0) {
+        *start += *run;
+        *run = -*run;
+    }
+    if (*start + *run < 0 || *start >= extent)
+        return false;
+    if (*start < 0)
+        *start = 0;
+    if (*start + *run > extent)
+        *run = extent - *start;
+    return true;
+}
+
+} // namespace
+
 void RBitmap8::RenderHLine(int32_t x, int32_t y, int32_t length, uint8_t index)
 {
-    if (y < 0 || y >= height)
+    int64_t start, run;
+    if (y < 0 || y >= height || !ClipRun(x, length, width, &start, &run))
         return;
-    int64_t start = x, run = length;
-    if (run < 0) {
-        start += run;
-        run = -run;
-    }
-    if (start + run < 0 || start >= width)
-        return;
-    // A run that starts left of the bitmap is moved to column 0 with its length kept.
-    if (start < 0)
-        start = 0;
-    if (start + run > width)
-        run = width - start;
     std::memset(bits + y * bytesPerRow + start, index, size_t(run));
 }
 
 void RBitmap8::RenderVLine(int32_t x, int32_t y, int32_t length, uint8_t index)
 {
-    if (x < 0 || x >= width)
+    int64_t start, run;
+    if (x < 0 || x >= width || !ClipRun(y, length, height, &start, &run))
         return;
-    int64_t start = y, run = length;
-    if (run < 0) {
-        start += run;
-        run = -run;
-    }
-    if (start + run < 0 || start >= height)
-        return;
-    // A run that starts above the bitmap is moved to row 0 with its length kept.
-    if (start < 0)
-        start = 0;
-    if (start + run > height)
-        run = height - start;
     uint8_t* pixel = bits + start * bytesPerRow + x;
     for (int64_t j = 0; j < run; ++j, pixel += bytesPerRow)
         *pixel = index;

@@ -10,7 +10,7 @@
 
 namespace {
 
-constexpr uint32_t kType = ResourceType("tSTR");
+constexpr uint32_t kType = FourCC("tSTR");
 
 // A strip with the system font's metrics whose every glyph cell holds its character code in
 // every pixel, except the bottom-left pixel of 'A' (column 231), which is ink.

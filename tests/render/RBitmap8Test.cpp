@@ -65,7 +65,7 @@ ColorTable* NewTable(rgb_color entry)
 
 // A test font registered under its own type code: 4 x 6 cells for '0'..'3', each glyph a
 // different ink pattern; its right column and top row are ink (255), the rest 254 or 0.
-constexpr uint32_t kTestFontType = ResourceType("tFNT");
+constexpr uint32_t kTestFontType = FourCC("tFNT");
 
 RBMFont8& TestFont()
 {
@@ -478,13 +478,13 @@ TEST(RBitmap8, StringsShareOneCursor)
 TEST(RBitmap8, LoadFromResourceReadsRawRows)
 {
     static const uint8_t data[] = { 1, 2, 3, 4, 5, 6, 7, 8, 9, 10, 11, 12, 13, 14, 15, 16 };
-    RegisterResource(ResourceType("tRAW"), 3, data, sizeof data);
+    RegisterResource(FourCC("tRAW"), 3, data, sizeof data);
     Canvas b(4, 2);
-    EXPECT_TRUE(b.LoadFromResource(int32_t(ResourceType("tRAW")), 3, 8, 8));
+    EXPECT_TRUE(b.LoadFromResource(int32_t(FourCC("tRAW")), 3, 8, 8));
     EXPECT_EQ(At(b, 0, 0), 9);
     EXPECT_EQ(At(b, 3, 1), 16);
     // A missing resource still reports that the resources could be opened, and reads nothing.
-    EXPECT_TRUE(b.LoadFromResource(int32_t(ResourceType("tRAW")), 4, 0, 8));
+    EXPECT_TRUE(b.LoadFromResource(int32_t(FourCC("tRAW")), 4, 0, 8));
     EXPECT_EQ(At(b, 0, 0), 9);
 }
 

@@ -62,12 +62,12 @@ protected:
 
 TEST_F(Resources, TypeCodesAreMostSignificantCharacterFirst)
 {
-    EXPECT_EQ(ResourceType("Raw8"), 0x52617738u);
-    EXPECT_EQ(ResourceType("FONT"), 0x464F4E54u);
-    EXPECT_EQ(ResourceType("McPc"), 0x4d635063u);
-    EXPECT_EQ(ResourceType("IPCL"), 0x4950434cu);
-    EXPECT_EQ(ResourceType("TGcL"), 0x5447634cu);
-    EXPECT_EQ(ResourceType("Dzon"), 0x447a6f6eu);
+    EXPECT_EQ(FourCC("Raw8"), 0x52617738u);
+    EXPECT_EQ(FourCC("FONT"), 0x464F4E54u);
+    EXPECT_EQ(FourCC("McPc"), 0x4d635063u);
+    EXPECT_EQ(FourCC("IPCL"), 0x4950434cu);
+    EXPECT_EQ(FourCC("TGcL"), 0x5447634cu);
+    EXPECT_EQ(FourCC("Dzon"), 0x447a6f6eu);
 }
 
 TEST_F(Resources, EveryResourceHasItsSizeAndReadsBack)

@@ -7,6 +7,7 @@
 #include "Images.h"
 #include "Sheet.h"
 
+#include "core/MessageCodes.h"
 #include "platform/Resources.h"
 
 #include <cstdio>
@@ -58,9 +59,9 @@ int main(int argc, char** argv)
     if (strip.size() != kStripBytes)
         return Fail(stripPath,
             "is " + std::to_string(strip.size()) + " bytes, not " + std::to_string(kStripBytes));
-    RegisterResource(ResourceType("FONT"), kSystemFontId, strip.data(), strip.size());
-    RBMFont8 font(int32_t(ResourceType("FONT")), kSystemFontId, kSystemFontStripWidth,
-        kSystemFontCharHeight, kSystemFontCharWidth, kSystemFontFirstChar, kSystemFontLastChar);
+    RegisterResource(kFontType, kSystemFontId, strip.data(), strip.size());
+    RBMFont8 font(int32_t(kFontType), kSystemFontId, kSystemFontStripWidth, kSystemFontCharHeight,
+        kSystemFontCharWidth, kSystemFontFirstChar, kSystemFontLastChar);
 
     std::vector<Resource> resources = DrawImages(font);
     resources.push_back({ "FONT", 0, kSystemFontStripWidth, kSystemFontCharHeight, 1,

@@ -1,0 +1,43 @@
+// Dragging messages between views. A drag carries the message itself, in-process, under one
+// private MIME type (its pointers are only good inside the running program), with a 32 x 32
+// render bitmap as its image; a view that takes drops turns the drop back into the message,
+// marked as dropped at the point where it was let go.
+#pragma once
+
+#include "platform/BPoint.h"
+#include "platform/Message.h"
+
+#include <QMimeData>
+
+class QDrag;
+class QDropEvent;
+class QWidget;
+class RBitmap8;
+
+inline constexpr char kMessageMimeType[] = "application/x-nightdome-message";
+
+// The drag's payload: a copy of the message.
+class MessageMimeData : public QMimeData {
+public:
+    explicit MessageMimeData(const Message& message);
+    const Message& GetMessage() const { return fMessage; }
+
+private:
+    Message fMessage;
+};
+
+// Builds the drag of message from source, its picture the image (palette index 255
+// transparent), held at hotSpot (bitmap coordinates). The caller runs it with exec(); headless
+// tests look at what it carries instead.
+QDrag* MakeMessageDrag(QWidget* source, const Message& message, RBitmap8* image, BPoint hotSpot);
+
+// Builds the drag and runs it until the button is let go; returns what happened to it.
+Qt::DropAction DragMessage(
+    QWidget* source, const Message& message, RBitmap8* image, BPoint hotSpot);
+
+// The message a drag carries; null for anything else (files, text, other programs' data).
+const Message* DraggedMessage(const QMimeData* data);
+
+// The dropped message, marked as dropped at the drop point in screen coordinates; false, and
+// the drop refused, when the event carries anything but a message.
+bool TakeDroppedMessage(QDropEvent* event, QWidget* receiver, Message* message);

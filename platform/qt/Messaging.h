@@ -1,0 +1,38 @@
+// Posting messages between windows. A handler is any QObject that also derives from BHandler;
+// a posted message is delivered later, by the event loop, to its MessageReceived.
+#pragma once
+
+#include "platform/Message.h"
+
+#include <QEvent>
+#include <QObject>
+
+class QWidget;
+
+class BHandler {
+public:
+    virtual ~BHandler() = default;
+    // Handles one message; the message is owned by the caller and lives for the call only.
+    virtual void MessageReceived(Message* message) = 0;
+};
+
+// The event that carries a posted message to its handler.
+class MessageEvent : public QEvent {
+public:
+    explicit MessageEvent(const Message& message);
+    static QEvent::Type EventType();
+
+    Message message;
+};
+
+// Posts a copy of message to target. Returns false, posting nothing, when target is null
+// (a handler whose window has closed, held in a QPointer, reads as null). A handler deleted
+// before the event loop gets to the message never receives it.
+bool PostMessage(QObject* target, const Message& message);
+
+// Posts to the view of window whose object name is viewName; false when there is none.
+bool PostMessageToView(QWidget* window, const char* viewName, const Message& message);
+
+// Delivers the message events of the current event loop until none is pending: for tests and
+// for code that must see its posted messages handled before it goes on.
+void DeliverPostedMessages();

@@ -1,0 +1,75 @@
+#include "platform/qt/RecordingHandler.h"
+
+#include "core/MessageCodes.h"
+#include "platform/qt/MessageDrag.h"
+#include "render/RBitmap8.h"
+
+#include <QDrag>
+#include <QDropEvent>
+#include <QMimeData>
+#include <gtest/gtest.h>
+
+TEST(MessageDrag, ADragCarriesTheMessageAndItsPicture)
+{
+    QWidget source;
+    RBitmap8 image(BRect(0, 0, 31, 31));
+    image.EraseMap(255);
+    image.RenderSquare(11, 11, 10, 63);
+    int mask = 0;
+    Message message(kStarArrayMessage);
+    message.AddPointer(kSystemArrayPtrString, &mask);
+    message.AddInt32(kSystemIndexString, 17);
+
+    QDrag* drag = MakeMessageDrag(&source, message, &image, BPoint(15, 16));
+    const Message* carried = DraggedMessage(drag->mimeData());
+    ASSERT_NE(carried, nullptr);
+    EXPECT_EQ(carried->what, kStarArrayMessage);
+    EXPECT_EQ(carried->FindPointer(kSystemArrayPtrString), &mask);
+    EXPECT_EQ(carried->FindInt32(kSystemIndexString), 17);
+    EXPECT_TRUE(drag->mimeData()->hasFormat(kMessageMimeType));
+    EXPECT_EQ(drag->hotSpot(), QPoint(15, 16));
+
+    const QImage picture = drag->pixmap().toImage().convertToFormat(QImage::Format_ARGB32);
+    ASSERT_EQ(picture.size(), QSize(32, 32));
+    EXPECT_EQ(qAlpha(picture.pixel(0, 0)), 0); // index 255 is transparent
+    EXPECT_EQ(picture.pixel(15, 15), qRgba(255, 255, 255, 255));
+    EXPECT_EQ(qAlpha(picture.pixel(10, 15)), 0);
+    delete drag;
+}
+
+TEST(MessageDrag, ADropGivesBackTheMessageMarkedDroppedWhereItWasLetGo)
+{
+    RecordingHandler target;
+    target.setGeometry(100, 200, 300, 300);
+    Message message(kStarMessage);
+    message.AddInt32(kSystemIndexString, 3);
+    MessageMimeData data(message);
+    QDropEvent drop(QPointF(40, 50), Qt::CopyAction, &data, Qt::LeftButton, Qt::NoModifier);
+
+    Message dropped;
+    ASSERT_TRUE(TakeDroppedMessage(&drop, &target, &dropped));
+    EXPECT_TRUE(drop.isAccepted());
+    EXPECT_TRUE(dropped.WasDropped());
+    EXPECT_EQ(dropped.FindInt32(kSystemIndexString), 3);
+    const QPoint screen = target.mapToGlobal(QPoint(40, 50));
+    EXPECT_EQ(dropped.DropPoint().x, screen.x());
+    EXPECT_EQ(dropped.DropPoint().y, screen.y());
+    EXPECT_FALSE(message.WasDropped()); // the sender's message is untouched
+}
+
+TEST(MessageDrag, ForeignDropsAreRefused)
+{
+    RecordingHandler target;
+    QMimeData text;
+    text.setText("Sirius");
+    QDropEvent drop(QPointF(1, 1), Qt::CopyAction, &text, Qt::LeftButton, Qt::NoModifier);
+    Message dropped(kClipToggle);
+    EXPECT_FALSE(TakeDroppedMessage(&drop, &target, &dropped));
+    EXPECT_FALSE(drop.isAccepted());
+    EXPECT_EQ(dropped.what, kClipToggle); // untouched
+    EXPECT_EQ(DraggedMessage(&text), nullptr);
+
+    QMimeData files;
+    files.setUrls({ QUrl::fromLocalFile("/tmp/stars.dat") });
+    EXPECT_EQ(DraggedMessage(&files), nullptr);
+}

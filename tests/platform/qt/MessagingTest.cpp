@@ -1,0 +1,79 @@
+#include "platform/qt/RecordingHandler.h"
+
+#include "core/MessageCodes.h"
+
+#include <QApplication>
+#include <QPointer>
+#include <gtest/gtest.h>
+
+TEST(Messaging, PostedMessagesArriveLaterThroughTheEventLoop)
+{
+    RecordingHandler handler;
+    Message message(kStarMessage);
+    message.AddInt32(kSystemIndexString, 5);
+    ASSERT_TRUE(PostMessage(&handler, message));
+    EXPECT_TRUE(handler.received.empty()); // posting is not calling
+    message.AddInt32(kSystemIndexString, 6); // the posted copy is not the caller's message
+    DeliverPostedMessages();
+    ASSERT_EQ(handler.received.size(), 1u);
+    EXPECT_EQ(handler.received[0].what, kStarMessage);
+    EXPECT_EQ(handler.received[0].FindInt32(kSystemIndexString), 5);
+    EXPECT_FALSE(handler.received[0].HasInt32(kSystemIndexString, 1));
+}
+
+TEST(Messaging, MessagesArriveInTheOrderPosted)
+{
+    RecordingHandler handler;
+    for (int32_t i = 0; i < 5; i++) {
+        Message message(kStarMessage);
+        message.AddInt32(kSystemIndexString, i);
+        PostMessage(&handler, message);
+    }
+    DeliverPostedMessages();
+    ASSERT_EQ(handler.received.size(), 5u);
+    for (int32_t i = 0; i < 5; i++)
+        EXPECT_EQ(handler.received[i].FindInt32(kSystemIndexString), i);
+}
+
+TEST(Messaging, ToAViewOfAWindowByItsName)
+{
+    QWidget window;
+    auto* view = new RecordingHandler(&window);
+    view->setObjectName("HRView");
+    EXPECT_TRUE(PostMessageToView(&window, "HRView", Message(kUniversePointer)));
+    EXPECT_FALSE(PostMessageToView(&window, "Star Info View", Message(kUniversePointer)));
+    EXPECT_FALSE(PostMessageToView(nullptr, "HRView", Message(kUniversePointer)));
+    DeliverPostedMessages();
+    ASSERT_EQ(view->received.size(), 1u);
+    EXPECT_EQ(view->received[0].what, kUniversePointer);
+}
+
+TEST(Messaging, PostingToAClosedWindowDoesNothing)
+{
+    auto* window = new RecordingHandler;
+    window->setAttribute(Qt::WA_DeleteOnClose);
+    window->show();
+    QPointer<QObject> target = window;
+    window->close();
+    QCoreApplication::sendPostedEvents(nullptr, QEvent::DeferredDelete);
+    ASSERT_TRUE(target.isNull());
+    EXPECT_FALSE(PostMessage(target, Message(kClipToggle)));
+    DeliverPostedMessages(); // nothing to deliver, nothing to crash
+}
+
+TEST(Messaging, AHandlerDeletedBeforeDeliveryNeverReceives)
+{
+    auto* handler = new RecordingHandler;
+    ASSERT_TRUE(PostMessage(handler, Message(kClipToggle)));
+    delete handler; // Qt drops the events still queued for it
+    DeliverPostedMessages();
+    SUCCEED();
+}
+
+TEST(Messaging, ObjectsThatAreNoHandlersIgnoreMessages)
+{
+    QObject plain;
+    EXPECT_TRUE(PostMessage(&plain, Message(kClipToggle)));
+    DeliverPostedMessages();
+    SUCCEED();
+}
