@@ -2,7 +2,9 @@
 #include "platform/qt/Messaging.h"
 
 #include <QCoreApplication>
+#include <QThread>
 #include <QWidget>
+#include <atomic>
 
 namespace {
 
@@ -25,14 +27,25 @@ public:
     }
 };
 
+// Installs the dispatcher once for the running application. The filter must live in the
+// application's thread; a first post from another thread (a render thread, say) queues the
+// installation there, ahead of its own message, so the message still finds the filter.
 void InstallDispatcher()
 {
+    static std::atomic<QCoreApplication*> installedFor { nullptr };
     QCoreApplication* application = QCoreApplication::instance();
-    if (!application || application->property("nightdomeMessageDispatch").toBool())
+    QCoreApplication* previous = installedFor.load();
+    if (!application || previous == application
+        || !installedFor.compare_exchange_strong(previous, application))
         return;
-    // Owned by the application: it lives exactly as long as the event loop it serves.
-    application->installEventFilter(new MessageDispatcher(application));
-    application->setProperty("nightdomeMessageDispatch", true);
+    auto install = [application] {
+        // Owned by the application: it lives exactly as long as the event loop it serves.
+        application->installEventFilter(new MessageDispatcher(application));
+    };
+    if (QThread::currentThread() == application->thread())
+        install();
+    else
+        QMetaObject::invokeMethod(application, install, Qt::QueuedConnection);
 }
 
 } // namespace
@@ -67,5 +80,7 @@ bool PostMessageToView(QWidget* window, const char* viewName, const Message& mes
 
 void DeliverPostedMessages()
 {
-    QCoreApplication::sendPostedEvents(nullptr, MessageEvent::EventType());
+    // Everything posted, in order: a dispatcher whose installation was queued from another
+    // thread must be in place before the messages behind it.
+    QCoreApplication::sendPostedEvents();
 }

@@ -33,6 +33,6 @@ bool PostMessage(QObject* target, const Message& message);
 // Posts to the view of window whose object name is viewName; false when there is none.
 bool PostMessageToView(QWidget* window, const char* viewName, const Message& message);
 
-// Delivers the message events of the current event loop until none is pending: for tests and
-// for code that must see its posted messages handled before it goes on.
+// Delivers what is posted to this thread's objects, messages included, until nothing is
+// pending: for tests and for code that must see its posted messages handled before it goes on.
 void DeliverPostedMessages();

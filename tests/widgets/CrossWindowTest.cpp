@@ -1,6 +1,8 @@
 // Behaviour across top-level windows on a real X server (Xvfb), driven by xdotool as a person
 // would drive it: a message dragged from one window to another, and help shown in one window
 // while the mouse is over a button of another.
+#include "X11Support.h"
+
 #include "core/MessageCodes.h"
 #include "platform/qt/MessageDrag.h"
 #include "platform/qt/Messaging.h"
@@ -38,57 +40,6 @@ protected:
     }
 };
 
-// Takes message drops and keeps the last one.
-class DropTarget : public QWidget, public BHandler {
-public:
-    explicit DropTarget(QWidget* parent)
-        : QWidget(parent)
-    {
-        setAcceptDrops(true);
-    }
-    void MessageReceived(Message* message) override { received = *message; }
-
-    std::optional<Message> received;
-
-protected:
-    void dragEnterEvent(QDragEnterEvent* event) override
-    {
-        if (DraggedMessage(event->mimeData()))
-            event->acceptProposedAction();
-    }
-    void dragMoveEvent(QDragMoveEvent* event) override
-    {
-        if (DraggedMessage(event->mimeData()))
-            event->acceptProposedAction();
-    }
-    void dropEvent(QDropEvent* event) override
-    {
-        Message message;
-        if (TakeDroppedMessage(event, this, &message))
-            MessageReceived(&message);
-    }
-};
-
-// Runs xdotool with the given commands without blocking the event loop: a drag runs a nested
-// loop of its own while the pointer moves.
-class Xdotool {
-public:
-    void Run(const QStringList& arguments)
-    {
-        fProcess.start("xdotool", arguments);
-        ASSERT_TRUE(fProcess.waitForStarted(5000)) << "xdotool is not installed";
-    }
-    bool Finished() const { return fProcess.state() == QProcess::NotRunning; }
-
-private:
-    QProcess fProcess;
-};
-
-QString Number(int n)
-{
-    return QString::number(n);
-}
-
 class CrossWindow : public ::testing::Test {
 protected:
     void SetUp() override
@@ -120,18 +71,7 @@ TEST_F(CrossWindow, AMessageDraggedToAnotherWindowArrivesWithItsFieldsAndDropPoi
     const QPoint from = source->mapToGlobal(QPoint(50, 50));
     const QPoint to = target->mapToGlobal(QPoint(110, 90));
     Xdotool xdotool;
-    QStringList steps { "mousemove", Number(from.x()), Number(from.y()), "sleep", "0.3",
-        "mousedown", "1", "sleep", "0.3" };
-    for (int i = 1; i <= 10; i++) {
-        const QPoint p = from + (to - from) * i / 10;
-        steps << "mousemove" << Number(p.x()) << Number(p.y()) << "sleep"
-              << "0.05";
-    }
-    steps << "sleep"
-          << "0.3"
-          << "mouseup"
-          << "1";
-    xdotool.Run(steps);
+    xdotool.Run(DragSteps(from, to));
 
     ASSERT_TRUE(QTest::qWaitFor([&] { return target->received.has_value(); }, 15000))
         << "no drop arrived";

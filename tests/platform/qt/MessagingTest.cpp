@@ -5,6 +5,7 @@
 #include <QApplication>
 #include <QPointer>
 #include <gtest/gtest.h>
+#include <thread>
 
 TEST(Messaging, PostedMessagesArriveLaterThroughTheEventLoop)
 {
@@ -76,4 +77,20 @@ TEST(Messaging, ObjectsThatAreNoHandlersIgnoreMessages)
     EXPECT_TRUE(PostMessage(&plain, Message(kClipToggle)));
     DeliverPostedMessages();
     SUCCEED();
+}
+
+TEST(Messaging, MessagesPostedFromOtherThreadsArriveOnTheHandlersThread)
+{
+    RecordingHandler handler;
+    std::thread poster([&] {
+        for (int32_t i = 0; i < 3; i++) {
+            Message message(kStarMessage);
+            message.AddInt32(kSystemIndexString, i);
+            PostMessage(&handler, message);
+        }
+    });
+    poster.join();
+    DeliverPostedMessages();
+    ASSERT_EQ(handler.received.size(), 3u);
+    EXPECT_EQ(handler.received[2].FindInt32(kSystemIndexString), 2);
 }

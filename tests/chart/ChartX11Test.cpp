@@ -1,0 +1,97 @@
+// A chart window on a real X server (Xvfb), worked with xdotool as a person would: hovering a
+// star, clicking it twice and dragging it to another window.
+#include "ChartFixture.h"
+#include "X11Support.h"
+
+#include "chart/UniverseWindow.h"
+#include "core/MessageCodes.h"
+#include "platform/qt/RecordingHandler.h"
+#include "widgets/InfoView.h"
+
+#include <QTest>
+
+TEST_F(ChartTest, AStarHoveredClickedTwiceAndDraggedToAnotherWindow)
+{
+    if (QGuiApplication::platformName() != "xcb")
+        GTEST_SKIP() << "needs an X server: run under scripts/with-xvfb";
+    Universe* universe = MakeUniverse({
+        { "The Sun", 0, 0, 0, 4.83 },
+        { "Sirius", -0.494, -0.759, 2.477, 1.454, "A0" },
+        { "Procyon", -1.365, 0.320, 3.228, 2.68, "F5" },
+    });
+    QWidget controls;
+    controls.setGeometry(900, 50, 320, 60);
+    auto* help = new InfoView(BRect(0, 20, 319, 39), "Info View", "", &controls);
+    controls.show();
+
+    auto* window = new UniverseWindow(BPoint(90, 140), 328, 340, "Nightdome", help, universe);
+    UniverseView* view = window->View();
+    *view->GetRadialVelocityY() = 0; // a still chart, so the stars stay where they were found
+    auto* strip = window->findChild<InfoView*>("SystemName");
+
+    QWidget receiver;
+    receiver.setGeometry(600, 140, 240, 240);
+    auto* target = new DropTarget(&receiver);
+    target->setGeometry(0, 0, 240, 240);
+    receiver.show();
+    ASSERT_TRUE(QTest::qWaitForWindowExposed(window));
+    ASSERT_TRUE(QTest::qWaitForWindowExposed(&receiver));
+
+    // Sirius, wherever the camera shows it.
+    BPoint where;
+    ASSERT_TRUE(QTest::qWaitFor(
+        [&] {
+            where = view->ScreenPointOf(1);
+            return where.x > 0;
+        },
+        5000));
+    const QPoint sirius = view->mapToGlobal(QPoint(int(where.x), int(where.y)));
+    Xdotool hover;
+    hover.Run({ "mousemove", Number(sirius.x()), Number(sirius.y()) });
+    EXPECT_TRUE(QTest::qWaitFor([&] { return strip->text() == "1: Sirius ( 1.5 A0 )"; }, 10000))
+        << strip->text().toStdString();
+    EXPECT_TRUE(QTest::qWaitFor(
+        [&] { return help->text() == "Click star to make Selection or drag to another view"; },
+        10000))
+        << help->text().toStdString();
+    EXPECT_TRUE(QTest::qWaitFor([&] { return hover.Finished(); }, 5000));
+
+    Xdotool select;
+    select.Run(ClickAt(sirius));
+    EXPECT_TRUE(QTest::qWaitFor([&] { return view->GetSelectedSystem() == 1; }, 10000));
+    EXPECT_TRUE(
+        QTest::qWaitFor([&] { return help->text() == "Click star to change Origin"; }, 10000))
+        << help->text().toStdString();
+    EXPECT_TRUE(QTest::qWaitFor([&] { return select.Finished(); }, 5000));
+
+    Xdotool origin;
+    origin.Run(ClickAt(sirius));
+    EXPECT_TRUE(
+        QTest::qWaitFor([&] { return view->ReadOut().rfind("Origin: Sirius\n", 0) == 0; }, 10000))
+        << view->ReadOut();
+    EXPECT_TRUE(QTest::qWaitFor([&] { return origin.Finished(); }, 5000));
+
+    // The chart glides to its new origin: Sirius ends at the centre, where it is dragged from.
+    ASSERT_TRUE(QTest::qWaitFor(
+        [&] {
+            const BPoint now = view->ScreenPointOf(1);
+            return std::abs(now.x - view->Frame().right / 2) < 2
+                && std::abs(now.y - view->Frame().bottom / 2) < 2;
+        },
+        10000));
+    const BPoint centre = view->ScreenPointOf(1);
+    const QPoint from = view->mapToGlobal(QPoint(int(centre.x), int(centre.y)));
+    const QPoint to = target->mapToGlobal(QPoint(120, 120));
+    Xdotool drag;
+    drag.Run(DragSteps(from, to));
+    ASSERT_TRUE(QTest::qWaitFor([&] { return target->received.has_value(); }, 15000)) << "no drop";
+    EXPECT_TRUE(QTest::qWaitFor([&] { return drag.Finished(); }, 5000));
+    EXPECT_EQ(target->received->what, kStarMessage);
+    EXPECT_EQ(target->received->FindInt32(kSystemIndexString), 1);
+    EXPECT_TRUE(target->received->WasDropped());
+    EXPECT_EQ(target->received->DropPoint().x, to.x());
+    EXPECT_EQ(target->received->DropPoint().y, to.y());
+
+    window->close();
+    QCoreApplication::sendPostedEvents(nullptr, QEvent::DeferredDelete);
+}

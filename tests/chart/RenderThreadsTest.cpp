@@ -1,0 +1,172 @@
+// The frame loop on its threads: workers, pausing, resizing and stopping.
+#include "ChartFixture.h"
+
+#include <QTest>
+#include <algorithm>
+#include <chrono>
+#include <dirent.h>
+#include <fstream>
+#include <future>
+#include <thread>
+
+using namespace std::chrono_literals;
+
+namespace {
+
+// The names of this process's threads, as the kernel keeps them.
+std::vector<std::string> ThreadNames()
+{
+    std::vector<std::string> names;
+    DIR* tasks = opendir("/proc/self/task");
+    while (dirent* entry = readdir(tasks)) {
+        if (entry->d_name[0] == '.')
+            continue;
+        std::ifstream comm(std::string("/proc/self/task/") + entry->d_name + "/comm");
+        std::string name;
+        std::getline(comm, name);
+        names.push_back(name);
+    }
+    closedir(tasks);
+    return names;
+}
+
+int Count(const std::vector<std::string>& names, const std::string& name)
+{
+    return int(std::count(names.begin(), names.end(), name));
+}
+
+bool WaitForFrames(UniverseView* view, int64_t frames)
+{
+    return QTest::qWaitFor([&] { return view->FramesRendered() >= frames; }, 10000);
+}
+
+} // namespace
+
+class UniverseViewTest : public ChartTest {
+protected:
+    static TimedLock& HandOver(UniverseView* view) { return view->fHandOver; }
+    static int32_t FrontWidth(UniverseView* view) { return view->fFrontWidth; }
+};
+
+TEST_F(UniverseViewTest, OneThreadDrawsEverySystemWithoutWorkers)
+{
+    Universe* u = MakeUniverse({ { "Sol", 0, 0, 0, 4.7 }, { "Other", 3, 1, 2, 1.0 } });
+    UniverseView* view = MakeView(u, 1);
+    view->AttachedToWindow();
+    ASSERT_TRUE(WaitForFrames(view, 3));
+    const auto during = ThreadNames();
+    EXPECT_EQ(Count(during, "Main Render Thr"), 1); // "Main Render Thread", cut to 15
+    EXPECT_EQ(Count(during, "Render Thread"), 0);
+    // Frames follow each other at the 15 ms pace: the one unit the main thread releases is the
+    // one it waits for, never the two-second time-out.
+    const int64_t start = view->FramesRendered();
+    EXPECT_TRUE(QTest::qWaitFor([&] { return view->FramesRendered() >= start + 10; }, 1900));
+    view->DetachedFromWindow();
+    EXPECT_EQ(Count(ThreadNames(), "Main Render Thr"), 0);
+    // The frames were shown: the centre cross is in the front buffer.
+    EXPECT_EQ(view->FrontImage().pixelIndex(40, 49), 55);
+}
+
+TEST_F(UniverseViewTest, WorkersShareTheFrameAndEndWithTheView)
+{
+    Universe* u = MakeUniverse({ { "Sol", 0, 0, 0, 4.7 }, { "Other", 3, 1, 2, 1.0 } });
+    UniverseView* view = MakeView(u, 3);
+    view->AttachedToWindow();
+    ASSERT_TRUE(WaitForFrames(view, 3));
+    const auto during = ThreadNames();
+    EXPECT_EQ(Count(during, "Main Render Thr"), 1);
+    EXPECT_EQ(Count(during, "Render Thread"), 2);
+    view->DetachedFromWindow();
+    EXPECT_EQ(Count(ThreadNames(), "Main Render Thr"), 0);
+    EXPECT_EQ(Count(ThreadNames(), "Render Thread"), 0);
+}
+
+TEST_F(UniverseViewTest, SuspendAndResumeOutsideTheLoopDoNothing)
+{
+    Universe* u = MakeUniverse({ { "Sol", 0, 0, 0, 4.7 } });
+    UniverseView* view = MakeView(u);
+    view->Suspend();
+    EXPECT_FALSE(view->suspendRequested);
+    view->AttachedToWindow();
+    ASSERT_TRUE(WaitForFrames(view, 1));
+    view->DetachedFromWindow();
+    EXPECT_FALSE(view->IsRunning());
+    view->suspendRequested = true;
+    view->Resume(); // after the loop ended: nothing
+    EXPECT_TRUE(view->suspendRequested);
+}
+
+TEST_F(UniverseViewTest, ASuspendedChartDrawsNothingUntilResumed)
+{
+    Universe* u = MakeUniverse({ { "Sol", 0, 0, 0, 4.7 } });
+    UniverseView* view = MakeView(u);
+    view->AttachedToWindow();
+    ASSERT_TRUE(WaitForFrames(view, 2));
+    view->Suspend();
+    // It finishes the frame it is in, then waits.
+    int64_t settled = -1;
+    ASSERT_TRUE(QTest::qWaitFor(
+        [&] {
+            const int64_t now = view->FramesRendered();
+            QTest::qWait(60); // four frame times
+            const bool still = view->FramesRendered() == now;
+            settled = now;
+            return still;
+        },
+        5000));
+    const double distance = view->cameraDistance;
+    QTest::qWait(200);
+    EXPECT_EQ(view->FramesRendered(), settled);
+    view->Resume();
+    EXPECT_TRUE(WaitForFrames(view, settled + 3));
+    EXPECT_EQ(view->cameraDistance, distance); // nothing of the camera was lost
+    view->DetachedFromWindow();
+}
+
+TEST_F(UniverseViewTest, ClosingASuspendedChartEndsAllItsThreads)
+{
+    Universe* u = MakeUniverse({ { "Sol", 0, 0, 0, 4.7 } });
+    UniverseView* view = MakeView(u, 2);
+    view->AttachedToWindow();
+    ASSERT_TRUE(WaitForFrames(view, 2));
+    view->Suspend();
+    QTest::qWait(100);
+    auto stopped = std::async(std::launch::async, [&] { view->DetachedFromWindow(); });
+    ASSERT_EQ(stopped.wait_for(5s), std::future_status::ready);
+    EXPECT_EQ(Count(ThreadNames(), "Main Render Thr"), 0);
+    EXPECT_EQ(Count(ThreadNames(), "Render Thread"), 0);
+}
+
+TEST_F(UniverseViewTest, AResizeShowsOnlyAfterAFrameIsHandedOver)
+{
+    Universe* u = MakeUniverse({ { "Sol", 0, 0, 0, 4.7 } });
+    UniverseView* view = MakeView(u);
+    view->show(); // a hidden widget hears of its resizes only when shown
+    view->AttachedToWindow();
+    ASSERT_TRUE(WaitForFrames(view, 2));
+    ASSERT_EQ(view->FrontImage().width(), 100);
+
+    // Another thread holds the hand-over lock, as a busy window would: frames are drawn but
+    // not shown.
+    TimedLock& handOver = HandOver(view);
+    std::promise<void> held, letGo;
+    std::thread holder([&] {
+        handOver.lock();
+        held.set_value();
+        letGo.get_future().wait();
+        handOver.unlock();
+    });
+    held.get_future().wait();
+    view->resize(60, 50);
+    const int64_t frames = view->FramesRendered();
+    EXPECT_TRUE(QTest::qWaitFor([&] { return view->FramesRendered() >= frames + 3; }, 10000));
+    EXPECT_EQ(FrontWidth(view), 100); // read while the holder keeps the lock
+    letGo.set_value();
+    holder.join();
+
+    EXPECT_TRUE(QTest::qWaitFor([&] { return view->FrontImage().width() == 60; }, 10000));
+    EXPECT_EQ(view->FrontImage().height(), 50);
+    view->DetachedFromWindow();
+    EXPECT_EQ(view->Frame().right, 59);
+    EXPECT_EQ(view->Frame().bottom, 49);
+}
