@@ -1,0 +1,38 @@
+// The application object's start and end.
+#include "app/ThreeDNightdomeApp.h"
+
+#include "controls/ControlWindow.h"
+#include "core/MessageCodes.h"
+#include "render/SpectralTables.h"
+#include "resources/ResourceData.h"
+
+ThreeDNightdomeApp::ThreeDNightdomeApp(int& argc, char** argv)
+{
+    if (!QCoreApplication::instance())
+        fApplication = std::make_unique<QApplication>(argc, argv);
+    QGuiApplication::setApplicationDisplayName("3D Nightdome");
+    QGuiApplication::setDesktopFileName(kAppSignature);
+    // The tables are written here, before any window or render thread exists, and only read
+    // afterwards.
+    gSpectralCTable = BuildSpectralTables();
+    InitResources();
+    fControlWindow = new ControlWindow(BPoint(90, 60), "3D Nightdome", this);
+}
+
+ThreeDNightdomeApp::~ThreeDNightdomeApp()
+{
+    delete fControlWindow.data();
+    FreeSpectralTables(gSpectralCTable);
+    gSpectralCTable = nullptr;
+}
+
+int ThreeDNightdomeApp::Run()
+{
+    return QCoreApplication::exec();
+}
+
+void ThreeDNightdomeApp::MessageReceived(Message* message)
+{
+    if (message->what == B_QUIT_REQUESTED)
+        QCoreApplication::quit();
+}
