@@ -7,6 +7,7 @@
 MGQuery::MGQuery(Universe* universe)
     : StarSysQuery(universe)
     , target(0)
+    , fMagnitudes(universe, systemCount, [](const Star* star) { return star->GetMagnitude(); })
 {
 }
 
@@ -14,20 +15,21 @@ MGQuery::~MGQuery() = default;
 
 int32_t MGQuery::GetSysMask(StarSysMask* mask, void* param)
 {
-    target = static_cast<const MGQueryParam*>(param)->magnitude;
-    return StarSysQuery::GetSysMask(mask, param);
+    const auto* p = static_cast<const MGQueryParam*>(param);
+    target = p->magnitude;
+    const int32_t mode = p->mode;
+    const double wanted = target;
+    return fMagnitudes.Select(mask, p->starMode,
+        [mode, wanted](double m) { return Compare(mode, m, wanted, kTolerance); });
 }
 
 bool MGQuery::Query(int32_t index, void* param)
 {
-    void* const* systems = Systems();
-    PrefetchMembers(systems, index + 2 * kPrefetchAhead);
-    PrefetchFirstStar(systems, index + kPrefetchAhead);
     const auto* p = static_cast<const MGQueryParam*>(param);
-    const StarSystem* system = static_cast<const StarSystem*>(systems[index]);
-    const int32_t stars = StarsToTest(system, p->starMode);
+    const double* magnitudes = fMagnitudes.ValuesOf(index);
+    const int32_t stars = fMagnitudes.StarsToTest(index, p->starMode);
     for (int32_t i = 0; i < stars; i++) {
-        if (Compare(p->mode, system->StarAt(i)->GetMagnitude(), target, kTolerance))
+        if (Compare(p->mode, magnitudes[i], target, kTolerance))
             return true;
     }
     return false;

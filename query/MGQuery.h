@@ -2,6 +2,7 @@
 #pragma once
 
 #include "core/MessageCodes.h"
+#include "query/PackedStarValues.h"
 #include "query/StarSysQuery.h"
 
 // Doubles in the records follow the 32-bit fields on a 4-byte boundary, as the panels lay
@@ -28,4 +29,7 @@ public:
     bool Query(int32_t index, void* param) override;
 
     double target; // absolute magnitude
+
+private:
+    PackedStarValues fMagnitudes; // every star's absolute magnitude
 };

@@ -7,6 +7,8 @@
 SCQuery::SCQuery(Universe* universe)
     : StarSysQuery(universe)
     , target(0)
+    , fClasses(
+          universe, systemCount, [](const Star* star) { return star->spectralClass.SCToDouble(); })
 {
 }
 
@@ -14,21 +16,21 @@ SCQuery::~SCQuery() = default;
 
 int32_t SCQuery::GetSysMask(StarSysMask* mask, void* param)
 {
-    target = static_cast<const SCQueryParam*>(param)->spectralClass->SCToDouble();
-    return StarSysQuery::GetSysMask(mask, param);
+    const auto* p = static_cast<const SCQueryParam*>(param);
+    target = p->spectralClass->SCToDouble();
+    const int32_t mode = p->mode;
+    const double wanted = target;
+    return fClasses.Select(
+        mask, p->starMode, [mode, wanted](double c) { return Compare(mode, c, wanted, 0); });
 }
 
 bool SCQuery::Query(int32_t index, void* param)
 {
-    void* const* systems = Systems();
-    PrefetchMembers(systems, index + 2 * kPrefetchAhead);
-    PrefetchFirstStar(systems, index + kPrefetchAhead);
     const auto* p = static_cast<const SCQueryParam*>(param);
-    const StarSystem* system = static_cast<const StarSystem*>(systems[index]);
-    const int32_t stars = StarsToTest(system, p->starMode);
+    const double* classes = fClasses.ValuesOf(index);
+    const int32_t stars = fClasses.StarsToTest(index, p->starMode);
     for (int32_t i = 0; i < stars; i++) {
-        const double value = system->StarAt(i)->spectralClass.SCToDouble();
-        if (Compare(p->mode, value, target, 0))
+        if (Compare(p->mode, classes[i], target, 0))
             return true;
     }
     return false;

@@ -2,6 +2,7 @@
 #pragma once
 
 #include "core/MessageCodes.h"
+#include "query/PackedStarValues.h"
 #include "query/StarSysQuery.h"
 
 class SpectralClass;
@@ -24,4 +25,7 @@ public:
     bool Query(int32_t index, void* param) override;
 
     double target; // the wanted class as SCToDouble gives it
+
+private:
+    PackedStarValues fClasses; // every star's class as SCToDouble gives it
 };

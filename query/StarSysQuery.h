@@ -84,7 +84,11 @@ public:
     // How many leading stars of system a star mode tests, never more than the system has.
     static int32_t StarsToTest(const StarSystem* system, int32_t starMode)
     {
-        const int32_t stars = system->CountItems();
+        return StarsToTest(system->CountItems(), starMode);
+    }
+    // The same for a system of `stars` stars.
+    static int32_t StarsToTest(int32_t stars, int32_t starMode)
+    {
         switch (starMode) {
         case kAnyStarInSystem:
             return stars;
