@@ -1,6 +1,6 @@
 // The controls under the mouse: pictures, cursor and help text as the pointer comes and goes,
 // and the drag loop sampling the real pointer every 50 ms while a button is held.
-#include "platform/qt/RecordingHandler.h"
+#include "widgets/WidgetEvents.h"
 
 #include "controls/SliderControl.h"
 #include "controls/TrackballControl.h"
@@ -20,33 +20,6 @@
 namespace {
 
 constexpr int kWait = 3000; // ms; generous for the sanitizer builds
-
-void Enter(QWidget* widget)
-{
-    QEnterEvent event(
-        QPointF(2, 2), widget->mapToGlobal(QPointF(2, 2)), widget->mapToGlobal(QPointF(2, 2)));
-    QCoreApplication::sendEvent(widget, &event);
-}
-
-void Leave(QWidget* widget)
-{
-    QEvent event(QEvent::Leave);
-    QCoreApplication::sendEvent(widget, &event);
-}
-
-std::vector<uint32_t> Codes(const RecordingHandler& handler)
-{
-    std::vector<uint32_t> codes;
-    for (const Message& m : handler.received)
-        codes.push_back(m.what);
-    return codes;
-}
-
-bool SamePixels(const RBitmap8* a, const RBitmap8* b)
-{
-    return a->BitsLength() == b->BitsLength()
-        && std::memcmp(a->Bits(), b->Bits(), size_t(a->BitsLength())) == 0;
-}
 
 struct Delta {
     double dx;

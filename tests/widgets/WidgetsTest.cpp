@@ -1,4 +1,4 @@
-#include "platform/qt/RecordingHandler.h"
+#include "widgets/WidgetEvents.h"
 
 #include "core/MessageCodes.h"
 #include "resources/ResourceData.h"
@@ -14,32 +14,6 @@
 #include <gtest/gtest.h>
 
 namespace {
-
-void Enter(QWidget* widget)
-{
-    QEnterEvent event(
-        QPointF(2, 2), widget->mapToGlobal(QPointF(2, 2)), widget->mapToGlobal(QPointF(2, 2)));
-    QCoreApplication::sendEvent(widget, &event);
-}
-
-void Leave(QWidget* widget)
-{
-    QEvent event(QEvent::Leave);
-    QCoreApplication::sendEvent(widget, &event);
-}
-
-std::vector<uint32_t> Codes(const RecordingHandler& handler)
-{
-    std::vector<uint32_t> codes;
-    for (const Message& m : handler.received)
-        codes.push_back(m.what);
-    return codes;
-}
-
-bool SamePixels(const RBitmap8* a, const RBitmap8* b)
-{
-    return std::memcmp(a->Bits(), b->Bits(), a->BitsLength()) == 0;
-}
 
 class Widgets : public ::testing::Test {
 protected:
