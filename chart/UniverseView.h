@@ -164,7 +164,7 @@ private:
     void ReplaceOffscreen();
 
 public:
-    // The view's state, in the order the chart's design lists it. Owned unless said otherwise.
+    // The view's state, fields in their long-standing order. Owned unless said otherwise.
     RBitmap8* offscreen = nullptr; // exactly the view's size
     RBitmap8* starSprite; // the 64 x 64 glow, 'Raw8' 5
     RBMFont8* font; // 'FONT' 0
