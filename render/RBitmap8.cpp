@@ -151,7 +151,7 @@ void RBitmap8::RenderPointAddReference(
 
 void RBitmap8::RenderSquare(int32_t x, int32_t y, int32_t size, uint8_t index)
 {
-    if (x < 0 || y < 0 || x > width - size || y > height - size || size < 1)
+    if (!FitsWhole(x, y, size))
         return;
     uint8_t* row = bits + y * bytesPerRow + x;
     for (int32_t j = 0; j < size; ++j, row += bytesPerRow)
@@ -161,7 +161,7 @@ void RBitmap8::RenderSquare(int32_t x, int32_t y, int32_t size, uint8_t index)
 void RBitmap8::RenderSquareAdd(
     int32_t x, int32_t y, int32_t size, const ColorTable* table, uint8_t intensity)
 {
-    if (size < 1 || x < 0 || y < 0 || x > width - size || y > height - size)
+    if (!FitsWhole(x, y, size))
         return;
     const uint32_t add = Spread(table->colors[intensity]);
     uint8_t* row = bits + y * bytesPerRow + x;
@@ -339,7 +339,7 @@ struct Sampler {
 
 void RBitmap8::RenderBitmap(int32_t x, int32_t y, const BBitmap* source, int32_t size)
 {
-    if (size < 1 || x < 0 || y < 0 || x > width - size || y > height - size)
+    if (!FitsWhole(x, y, size))
         return;
     const Sampler sampler(source, size);
     if (sampler.lastRow < 0)
@@ -358,7 +358,7 @@ void RBitmap8::RenderBitmap(int32_t x, int32_t y, const BBitmap* source, int32_t
 void RBitmap8::RenderBitmapAdd(
     int32_t x, int32_t y, const BBitmap* source, int32_t size, const ColorTable* table)
 {
-    if (size < 1 || x < 0 || y < 0 || x > width - size || y > height - size)
+    if (!FitsWhole(x, y, size))
         return;
     const Sampler sampler(source, size);
     if (sampler.lastRow < 0)

@@ -92,6 +92,12 @@ public:
 private:
     // The same rule, in the form the primitives use (see AddKernel in the .cpp).
     uint8_t AddedIndex(uint8_t pixel, uint32_t spreadAdd) const;
+    // Whether a size x size square at (x, y) lies wholly inside: squares and scaled bitmaps are
+    // drawn whole or not at all.
+    bool FitsWhole(int32_t x, int32_t y, int32_t size) const
+    {
+        return size >= 1 && x >= 0 && y >= 0 && x <= width - size && y <= height - size;
+    }
     void AddPixel(uint8_t* pixel, uint32_t spreadAdd) const;
 
     uint8_t* bits; // Bits(), cached; owned by the BBitmap part

@@ -1,6 +1,7 @@
 // The queries over a catalogue of real stars, written by the test in the catalogue's format
 // with each star's position from its right ascension, declination and distance (J2000,
 // parsecs): x = d cos(dec) cos(ra), y = d sin(dec), z = d cos(dec) sin(ra).
+#include "QueryMatches.h"
 #include "catalog/TempCatalogue.h"
 
 #include "catalog/SpectralClass.h"
@@ -130,19 +131,6 @@ protected:
         for (const char* name : names)
             indices.insert(IndexOf(name));
         return indices;
-    }
-
-    std::set<int32_t> Matches(StarSysQuery& query, void* param)
-    {
-        StarSysMask mask(universe.CountItems(), false, 0);
-        const int32_t count = query.GetSysMask(&mask, param);
-        EXPECT_EQ(count, mask.CountItems(true));
-        std::set<int32_t> found;
-        for (int32_t i = 0; i < mask.systemCount; i++) {
-            if (mask.GetStateSafe(i))
-                found.insert(i);
-        }
-        return found;
     }
 
     struct Point {

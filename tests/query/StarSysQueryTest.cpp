@@ -1,3 +1,4 @@
+#include "QueryMatches.h"
 #include "UniverseBuilder.h"
 
 #include "catalog/SpectralClass.h"
@@ -18,21 +19,6 @@
 #include <vector>
 
 namespace {
-
-// Runs query into a fresh mask of the universe's count that starts all true, so every 0 in
-// the answer was written by the query; checks the returned count against the mask's.
-std::set<int32_t> Matches(StarSysQuery& query, void* param)
-{
-    StarSysMask mask(query.universe->CountItems(), true, 0);
-    const int32_t count = query.GetSysMask(&mask, param);
-    EXPECT_EQ(count, mask.CountItems(true));
-    std::set<int32_t> found;
-    for (int32_t i = 0; i < mask.systemCount; i++) {
-        if (mask.GetStateSafe(i))
-            found.insert(i);
-    }
-    return found;
-}
 
 const TestStar kSunLike { "Star", "G2V", 4.83 };
 
