@@ -3,6 +3,7 @@
 // in the default view and in a view with every system in front of the camera.
 #include "catalog/Universe.h"
 #include "chart/UniverseView.h"
+#include "core/Constants.h"
 #include "render/SpectralTables.h"
 #include "resources/ResourceData.h"
 
@@ -15,21 +16,19 @@
 
 namespace {
 
-constexpr double kPi = 3.141592653589793;
-
 // Systems spread evenly through a sphere at the Sun's neighbourhood's density (about 0.07 a
 // cubic parsec), with magnitudes and classes spread like a catalogue's.
 std::unique_ptr<Universe> Synthetic(int32_t count)
 {
     auto universe = std::make_unique<Universe>(5000);
-    const double radius = std::cbrt(3.0 * count / (4 * kPi * 0.07));
+    const double radius = std::cbrt(3.0 * count / (4 * kPI * 0.07));
     std::mt19937_64 random(42);
     auto uniform = [&] { return double(random() >> 11) * 0x1.0p-53; };
     universe->AddItem(
         new StarSystem("The Sun", SVector(0, 0, 0), 0.887, SpectralTableFor(kClassG), 2));
     for (int32_t i = 1; i < count; i++) {
         const double r = radius * std::cbrt(uniform());
-        const double ra = 2 * kPi * uniform(), dec = std::asin(2 * uniform() - 1);
+        const double ra = (kPI + kPI) * uniform(), dec = std::asin(2 * uniform() - 1);
         const double magnitude = -2 + 16 * uniform();
         universe->AddItem(new StarSystem("",
             SVector(r * std::cos(dec) * std::cos(ra), r * std::sin(dec),

@@ -1,4 +1,5 @@
 // The two CSV inputs: the HYG database and a plain table with named columns.
+#include "core/Constants.h"
 #include "tools/importer/Designations.h"
 #include "tools/importer/SourceReaders.h"
 #include "tools/importer/StrictNumbers.h"
@@ -11,8 +12,6 @@
 #include <optional>
 
 namespace {
-
-constexpr double kPi = 3.141592653589793;
 
 std::string Lower(std::string s)
 {
@@ -207,8 +206,8 @@ void ReadHyg(
         }
         ImportStar star;
         star.line = table.Line();
-        star.ra = raHours / 24 * 2 * kPi;
-        star.dec = decDegrees / 180 * kPi;
+        star.ra = raHours / 24 * (kPI + kPI);
+        star.dec = decDegrees / 180 * kPI;
         star.parallax = 1000.0 / distance;
         if (const auto m = table.OptionalNumber(absmag, "absmag"))
             star.absoluteMagnitude = *m;
@@ -271,8 +270,8 @@ void ReadPlainCsv(
         }
         ImportStar star;
         star.line = table.Line();
-        star.ra = raDegrees / 180 * kPi;
-        star.dec = decDegrees / 180 * kPi;
+        star.ra = raDegrees / 180 * kPI;
+        star.dec = decDegrees / 180 * kPI;
         star.parallax = plx;
         if (const auto m = table.OptionalNumber(absmag, "absmag"))
             star.absoluteMagnitude = *m;

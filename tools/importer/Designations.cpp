@@ -1,6 +1,8 @@
 // Greek letters, constellation genitives and position designations.
 #include "tools/importer/Designations.h"
 
+#include "core/Constants.h"
+
 #include <cctype>
 #include <cmath>
 #include <cstdio>
@@ -216,14 +218,14 @@ std::string ReadableDesignation(const std::string& designation)
 
 std::string PositionDesignation(double ra, double dec)
 {
-    constexpr double kTurn = 2 * 3.141592653589793;
+    constexpr double kTurn = kPI + kPI;
     double hours = std::fmod(ra, kTurn) / kTurn * 24.0;
     if (hours < 0)
         hours += 24.0;
     // Whole tenths of a second of time and whole arc-seconds, so that nothing rounds up to 60.
     auto tenths = static_cast<long>(std::floor(hours * 36000.0 + 0.5)) % 864000;
     const long h = tenths / 36000, m = tenths / 600 % 60, secondTenths = tenths % 600;
-    const double degrees = dec * 180.0 / 3.141592653589793;
+    const double degrees = dec * 180.0 / kPI;
     const long arcseconds = static_cast<long>(std::floor(std::fabs(degrees) * 3600.0 + 0.5));
     char text[96];
     std::snprintf(text, sizeof text, "J%02ld%02ld%02ld.%ld%c%02ld%02ld%02ld", h, m,

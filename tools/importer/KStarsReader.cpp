@@ -1,4 +1,5 @@
 // The fixed-column Hipparcos-derived catalogue.
+#include "core/Constants.h"
 #include "tools/importer/Designations.h"
 #include "tools/importer/SourceReaders.h"
 #include "tools/importer/StrictNumbers.h"
@@ -6,8 +7,6 @@
 #include <cmath>
 
 namespace {
-
-constexpr double kPi = 3.141592653589793;
 
 // Column positions (0-based, end exclusive), checked against the file itself.
 struct Columns {
@@ -77,8 +76,8 @@ void ReadKStars(
 
         ImportStar star;
         star.line = number;
-        star.ra = (raH + raM / 60 + raS / 3600) / 24 * 2 * kPi;
-        star.dec = (sign == "-" ? -1 : 1) * (decD + decM / 60 + decS / 3600) / 180 * kPi;
+        star.ra = (raH + raM / 60 + raS / 3600) / 24 * (kPI + kPI);
+        star.dec = (sign == "-" ? -1 : 1) * (decD + decM / 60 + decS / 3600) / 180 * kPI;
         star.parallax = parallax;
         star.absoluteMagnitude = magnitude + 5 + 5 * std::log10(parallax / 1000);
 

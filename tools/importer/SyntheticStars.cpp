@@ -1,4 +1,5 @@
 // Synthetic catalogues for benchmarks, and spectral letters from colour.
+#include "core/Constants.h"
 #include "tools/importer/SourceReaders.h"
 
 #include <cmath>
@@ -25,7 +26,6 @@ const char* ClassFromColour(double bv)
 void GenerateStars(
     int64_t count, uint64_t seed, std::vector<ImportStar>& stars, ImportReport& report)
 {
-    constexpr double kPi = 3.141592653589793;
     // The generator's raw output is fixed by the standard; the doubles are made from it by
     // hand, so the same seed gives the same catalogue on every platform.
     std::mt19937_64 random(seed);
@@ -33,7 +33,7 @@ void GenerateStars(
     static const char* const kClasses[] = { "O9V", "B2IV", "B8V", "A0V", "A5V", "F2V", "F8V", "G2V",
         "G8III", "K0III", "K2V", "K5V", "M0V", "M2V", "M4Ve", "M6V" };
     // Stars per cubic parsec near the Sun, about; the sphere grows with the count.
-    const double radius = std::cbrt(3.0 * static_cast<double>(count) / (4 * kPi * 0.1));
+    const double radius = std::cbrt(3.0 * static_cast<double>(count) / (4 * kPI * 0.1));
 
     stars.reserve(stars.size() + static_cast<size_t>(count));
     ImportStar previous;
@@ -48,7 +48,7 @@ void GenerateStars(
             star.group = previous.group;
         } else {
             const double d = radius * std::cbrt(uniform()) + 0.5;
-            star.ra = 2 * kPi * uniform();
+            star.ra = (kPI + kPI) * uniform();
             star.dec = std::asin(2 * uniform() - 1);
             star.parallax = 1000.0 / d;
             star.group = i;

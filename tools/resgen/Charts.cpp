@@ -4,6 +4,8 @@
 
 #include "Paint.h"
 
+#include "core/Constants.h"
+
 #include <algorithm>
 #include <cmath>
 #include <cstdio>
@@ -11,8 +13,6 @@
 #include <functional>
 
 namespace {
-
-constexpr double kPi = 3.141592653589793;
 
 Resource Single(const char* type, int32_t id, int w, int h, const char* name,
     const std::function<void(RBitmap8&)>& paint)
@@ -147,7 +147,7 @@ Resource Glow()
         for (int y = 0; y < 64; ++y) {
             for (int x = 0; x < 64; ++x) {
                 const double dx = x - 31.5, dy = y - 31.5;
-                b.RenderPoint(x, y, uint8_t(GlowAt(std::hypot(dx, dy), std::atan2(dy, dx) + kPi)));
+                b.RenderPoint(x, y, uint8_t(GlowAt(std::hypot(dx, dy), std::atan2(dy, dx) + kPI)));
             }
         }
     });

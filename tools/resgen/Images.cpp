@@ -4,12 +4,12 @@
 
 #include "Paint.h"
 
+#include "core/Constants.h"
+
 #include <cmath>
 #include <functional>
 
 namespace {
-
-constexpr double kPi = 3.141592653589793;
 
 // Ink of the light buttons, and of the night-sky mouse controls.
 constexpr Rgb kInk { 28, 36, 64 };
@@ -105,14 +105,14 @@ std::vector<Resource> MouseControls()
             const double cx = 15.5 + dx, cy = 16.5 + dy;
             Disc(b, cx, cy, 9.5, { 24, 48, 120 });
             Ring(b, cx, cy, 9.5, 1.2, ink);
-            Ellipse(b, cx, cy, 9.5, 3.5, 1.0, ink, 0.0, kPi);
-            Ellipse(b, cx, cy, 4.0, 9.5, 1.0, ink, -kPi / 2, kPi / 2);
-            Ellipse(b, cx, cy, 13.0, 13.0, 1.1, ink, -kPi * 0.85, -kPi * 0.55);
-            Ellipse(b, cx, cy, 13.0, 13.0, 1.1, ink, -kPi * 0.45, -kPi * 0.15);
-            Arrow(b, cx + 13 * std::cos(-kPi * 0.2), cy + 13 * std::sin(-kPi * 0.2),
-                cx + 13 * std::cos(-kPi * 0.15), cy + 13 * std::sin(-kPi * 0.15), 1.1, ink);
-            Arrow(b, cx + 13 * std::cos(-kPi * 0.8), cy + 13 * std::sin(-kPi * 0.8),
-                cx + 13 * std::cos(-kPi * 0.85), cy + 13 * std::sin(-kPi * 0.85), 1.1, ink);
+            Ellipse(b, cx, cy, 9.5, 3.5, 1.0, ink, 0.0, kPI);
+            Ellipse(b, cx, cy, 4.0, 9.5, 1.0, ink, -kPI / 2, kPI / 2);
+            Ellipse(b, cx, cy, 13.0, 13.0, 1.1, ink, -kPI * 0.85, -kPI * 0.55);
+            Ellipse(b, cx, cy, 13.0, 13.0, 1.1, ink, -kPI * 0.45, -kPI * 0.15);
+            Arrow(b, cx + 13 * std::cos(-kPI * 0.2), cy + 13 * std::sin(-kPI * 0.2),
+                cx + 13 * std::cos(-kPI * 0.15), cy + 13 * std::sin(-kPI * 0.15), 1.1, ink);
+            Arrow(b, cx + 13 * std::cos(-kPI * 0.8), cy + 13 * std::sin(-kPI * 0.8),
+                cx + 13 * std::cos(-kPI * 0.85), cy + 13 * std::sin(-kPI * 0.85), 1.1, ink);
         }));
     out.push_back(MouseControl(
         2, "Camera distance: drag up and down", [](RBitmap8& b, double dx, double dy, Rgb ink) {
@@ -132,8 +132,8 @@ std::vector<Resource> MouseControls()
         4, "Clipping sphere: drag left and right", [](RBitmap8& b, double dx, double dy, Rgb ink) {
             const double cx = 15.5 + dx, cy = 13.0 + dy;
             for (int k = 0; k < 12; ++k) {
-                const double a = k * kPi / 6;
-                Ellipse(b, cx, cy, 9.0, 9.0, 1.1, ink, a, a + kPi / 10);
+                const double a = k * kPI / 6;
+                Ellipse(b, cx, cy, 9.0, 9.0, 1.1, ink, a, a + kPI / 10);
             }
             Disc(b, cx - 3, cy - 2, 1.2, kStarCore);
             Disc(b, cx + 3, cy + 3, 1.0, kStarRays);

@@ -2,6 +2,7 @@
 // look-ups by true colour, coverage-blended discs, rings and thick lines, bevelled button faces.
 #pragma once
 
+#include "core/Constants.h"
 #include "render/RBitmap8.h"
 
 #include <cstdint>
@@ -33,7 +34,7 @@ void Arrow(
     RBitmap8& bitmap, double x0, double y0, double x1, double y1, double thickness, Rgb colour);
 // An ellipse outline (axis-aligned), drawn as a chain of short strokes.
 void Ellipse(RBitmap8& bitmap, double cx, double cy, double rx, double ry, double thickness,
-    Rgb colour, double fromAngle = 0.0, double toAngle = 6.283185307179586);
+    Rgb colour, double fromAngle = 0.0, double toAngle = kPI + kPI);
 // A four-pointed sparkle with a round core, the program's picture of a star.
 void Sparkle(RBitmap8& bitmap, double cx, double cy, double size, Rgb core, Rgb rays);
 
