@@ -2,6 +2,7 @@
 #include "chart/UniverseView.h"
 
 #include "core/CCoord.h"
+#include "core/ShownCoord.h"
 #include "core/Truncate.h"
 
 #include <cmath>
@@ -130,12 +131,12 @@ void UniverseView::DrawClipCube()
 std::string UniverseView::FormatReadout() const
 {
     // The direction the camera looks from, back at the origin, as right ascension and
-    // declination.
+    // declination; a zero is printed without a minus sign.
     SVector view(0, 0, cameraDistance);
     pitch.Transform(&view);
     yaw.Transform(&view);
     view.z = -view.z;
-    const CCoord c(view);
+    const ShownCoord c { CCoord(view) };
     const StarSystem* origin = universe ? universe->SystemAt(originSystem) : nullptr;
     char text[256] = {};
     std::snprintf(text, sizeof text,

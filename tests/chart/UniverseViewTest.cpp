@@ -2,8 +2,10 @@
 #include "ChartFixture.h"
 
 #include "catalog/Star.h"
+#include "core/Constants.h"
 
 #include <cmath>
+#include <string>
 
 namespace {
 
@@ -246,4 +248,29 @@ TEST_F(ChartTest, TheReadOutNamesTheOriginAndDistance)
             ink += Pixel(view, x, y) == 55;
     }
     EXPECT_GT(ink, 200);
+}
+
+TEST_F(ChartTest, TheReadOutPutsNoMinusSignOnAZero)
+{
+    Universe* u = MakeUniverse({ { "Sol", 0, 0, 0, 4.7 } });
+    UniverseView* view = MakeView(u);
+    // Level, looking along the world's z axis: right ascension 6 h and a declination of exactly
+    // zero, which the arctangent gives as -0.
+    view->pitch.InitIdentity();
+    view->yaw.InitIdentity();
+    std::string text = view->ReadOut();
+    EXPECT_NE(text.find("\nRA: 6h 0.0m\nDEC: +0d 0.0'\n"), std::string::npos) << text;
+
+    // Half a degree south the sign stays, on the zero degrees; half a degree north it is a plus.
+    view->pitch.InitXRotation(-0.5 * kPI / 180);
+    text = view->ReadOut();
+    EXPECT_NE(text.find("\nDEC: -0d 30.0'\n"), std::string::npos) << text;
+    view->pitch.InitXRotation(0.5 * kPI / 180);
+    text = view->ReadOut();
+    EXPECT_NE(text.find("\nDEC: +0d 30.0'\n"), std::string::npos) << text;
+
+    // A hundredth of an arc-minute south shows as zero minutes, and so without a sign.
+    view->pitch.InitXRotation(-0.01 / 60 * kPI / 180);
+    text = view->ReadOut();
+    EXPECT_NE(text.find("\nDEC: +0d 0.0'\n"), std::string::npos) << text;
 }
