@@ -2,6 +2,9 @@
 
 #include <gtest/gtest.h>
 
+#include <chrono>
+#include <cstdint>
+
 TEST(Random, FirstDrawFromSeedOne)
 {
     Random r(1, 4096, 150889, 714025);
@@ -29,11 +32,24 @@ TEST(Random, RangedDrawsFollowTheSignOfTheSeed)
 
 TEST(Random, DefaultConstantsAndClockSeed)
 {
+    // The seed is the real-time clock read while the generator is made, taken into 32 signed
+    // bits: from 2038 on that wraps to a negative seed, which is the generator's own wrap-around
+    // and still the clock.
+    const auto now = [] {
+        return std::chrono::duration_cast<std::chrono::seconds>(
+            std::chrono::system_clock::now().time_since_epoch())
+            .count();
+    };
+    const int64_t before = now();
     const Random r;
+    const int64_t after = now();
     EXPECT_EQ(r.multiplier, 4096);
     EXPECT_EQ(r.increment, 150889);
     EXPECT_EQ(r.modulus, 714025);
-    EXPECT_GT(r.seed, 1700000000); // seconds since 1970, after late 2023
+    bool fromTheClock = false;
+    for (int64_t t = before; t <= after && !fromTheClock; t++)
+        fromTheClock = r.seed == static_cast<int32_t>(static_cast<uint32_t>(t));
+    EXPECT_TRUE(fromTheClock) << "seed " << r.seed << ", clock " << before << " to " << after;
 }
 
 TEST(Random, SequenceMatchesWrappingReference)

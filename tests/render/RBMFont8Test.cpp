@@ -90,4 +90,34 @@ TEST(RBMFont8, MissingResourceLeavesAnEmptyStrip)
     EXPECT_EQ(info.charWidth, 7);
 }
 
+TEST(RBMFont8, TheSystemFontConstantsAreOcrA672By14In7PixelCells)
+{
+    // What the chart and the terminal construct their font with: "OCR-A 10pt 672x14e7", the
+    // characters 32 (space) to 125 ('}').
+    EXPECT_EQ(kSystemFontId, 0);
+    EXPECT_EQ(kSystemFontStripWidth, 672);
+    EXPECT_EQ(kSystemFontCharHeight, 14);
+    EXPECT_EQ(kSystemFontCharWidth, 7);
+    EXPECT_EQ(kSystemFontFirstChar, 32);
+    EXPECT_EQ(kSystemFontLastChar, 125);
+    // The strip's rows lie back to back only for a width that is a multiple of 4, and the 94
+    // glyphs fit in its 96 cells.
+    EXPECT_EQ(kSystemFontStripWidth % 4, 0);
+    EXPECT_EQ(kSystemFontStripWidth / kSystemFontCharWidth, 96);
+    EXPECT_LE((kSystemFontLastChar - kSystemFontFirstChar + 1) * kSystemFontCharWidth,
+        kSystemFontStripWidth);
+
+    RegisterResource(kType, 2, Strip().data(), Strip().size());
+    RBMFont8 font(int32_t(kType), 2, kSystemFontStripWidth, kSystemFontCharHeight,
+        kSystemFontCharWidth, kSystemFontFirstChar, kSystemFontLastChar);
+    RBMFontInfo info {};
+    font.GetFontInfo(&info);
+    EXPECT_EQ(info.stripWidth, 672);
+    EXPECT_EQ(info.charHeight, 14);
+    EXPECT_EQ(info.charWidth, 7);
+    EXPECT_EQ(info.firstChar, 32);
+    EXPECT_EQ(info.lastChar, 125);
+    EXPECT_EQ(font.GlyphBits('A') - font.Bits(), 231);
+}
+
 } // namespace

@@ -110,6 +110,44 @@ TEST_F(Resources, SystemFontInfo)
     EXPECT_EQ(info.lastChar, 125);
 }
 
+TEST_F(Resources, TheFontStripAgreesWithTheSystemFontConstants)
+{
+    // The real strip is exactly as large as the constants the chart builds its font with, and
+    // its glyphs stand in the cells those constants give: every character from '!' to '}' has
+    // ink in its own cell, the space and the cells after the last character have none.
+    const uint32_t type = Code("FONT");
+    ASSERT_EQ(
+        ResourceSize(type, kSystemFontId), int64_t(kSystemFontStripWidth) * kSystemFontCharHeight);
+    RBMFont8 font(int32_t(type), kSystemFontId, kSystemFontStripWidth, kSystemFontCharHeight,
+        kSystemFontCharWidth, kSystemFontFirstChar, kSystemFontLastChar);
+    RBMFontInfo info {};
+    font.GetFontInfo(&info);
+    EXPECT_EQ(info.stripWidth, 672);
+    EXPECT_EQ(info.charHeight, 14);
+    EXPECT_EQ(info.charWidth, 7);
+    EXPECT_EQ(info.firstChar, 32);
+    EXPECT_EQ(info.lastChar, 125);
+    EXPECT_EQ(font.StripBytesPerRow(), kSystemFontStripWidth);
+
+    const auto inkInCell = [&](int cell) {
+        int ink = 0;
+        for (int y = 0; y < kSystemFontCharHeight; ++y) {
+            for (int x = 0; x < kSystemFontCharWidth; ++x)
+                ink += font.Bits()[y * kSystemFontStripWidth + cell * kSystemFontCharWidth + x]
+                    == 255;
+        }
+        return ink;
+    };
+    const int cells = kSystemFontStripWidth / kSystemFontCharWidth;
+    for (int c = kSystemFontFirstChar; c < kSystemFontFirstChar + cells; ++c) {
+        const int cell = c - kSystemFontFirstChar;
+        if (c == ' ' || c > kSystemFontLastChar)
+            EXPECT_EQ(inkInCell(cell), 0) << c;
+        else
+            EXPECT_GT(inkInCell(cell), 0) << c;
+    }
+}
+
 // Ink pixels (255) in the cell of character c; only 0 and 255 occur in the strip.
 int InkIn(const RBMFont8& font, int c)
 {
