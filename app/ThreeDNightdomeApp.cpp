@@ -12,6 +12,10 @@ ThreeDNightdomeApp::ThreeDNightdomeApp(int& argc, char** argv)
         fApplication = std::make_unique<QApplication>(argc, argv);
     QGuiApplication::setApplicationDisplayName("3D Nightdome");
     QGuiApplication::setDesktopFileName(kAppSignature);
+    // Only the control window ends the program (it asks for the quit when it closes). Qt would
+    // also quit when the last chart closes: the control window is a tool window, which Qt does
+    // not count among the windows that keep a program running.
+    QGuiApplication::setQuitOnLastWindowClosed(false);
     // The tables are written here, before any window or render thread exists, and only read
     // afterwards.
     gSpectralCTable = BuildSpectralTables();

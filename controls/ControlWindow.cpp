@@ -114,9 +114,14 @@ void ControlWindow::LinkControls(UniverseWindow* window)
 void ControlWindow::MessageReceived(Message* message)
 {
     switch (message->what) {
-    case kNewUniverseWindow:
-        OpenUniverseWindow();
+    case kNewUniverseWindow: {
+        UniverseWindow* window = OpenUniverseWindow();
+        // Controls that drive nothing (the last chart closed) take the new chart at once rather
+        // than waiting for it to be activated, which a bare X server never does.
+        if (!fLinked)
+            LinkControls(window);
         break;
+    }
     case kUniverseWindowActivated: {
         // Only a chart of ours: the pointer is checked against the list before it is used.
         auto* window = static_cast<UniverseWindow*>(message->FindPointer(kUWPointerString));

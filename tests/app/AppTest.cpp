@@ -1,9 +1,13 @@
 // The application object: the spectral tables it builds and the end of the program.
 #include "app/ThreeDNightdomeApp.h"
+#include "chart/UniverseWindow.h"
 #include "controls/ControlWindow.h"
+#include "core/MessageCodes.h"
 #include "render/SpectralTables.h"
 
+#include <QPointer>
 #include <QTimer>
+#include <QWindow>
 #include <gtest/gtest.h>
 
 TEST(ThreeDNightdomeApp, BuildsTheSpectralTablesAndOpensTheControls)
@@ -55,5 +59,48 @@ TEST(ThreeDNightdomeApp, ClosingTheControlsEndsTheProgramWithChartsOpen)
     guard.start(10000);
     EXPECT_EQ(application->Run(), 0);
     EXPECT_FALSE(timedOut) << "the program did not end";
+    delete application;
+}
+
+TEST(ThreeDNightdomeApp, ClosingTheOnlyChartLeavesTheProgramRunning)
+{
+    int argc = 1;
+    char name[] = "nightdome";
+    char* argv[] = { name, nullptr };
+    auto* application = new ThreeDNightdomeApp(argc, argv);
+    ControlWindow* controls = application->GetControlWindow();
+    ASSERT_EQ(controls->UniverseWindows().size(), 1);
+    QPointer<UniverseWindow> chart = controls->UniverseWindows().first().data();
+    bool stillRunning = false;
+    qsizetype chartsAfter = -1;
+    // Closed as a window manager closes it.
+    QTimer::singleShot(100, controls, [&] { chart->windowHandle()->close(); });
+    // Once the chart has been deleted, which follows its close, a quit the close asked for has
+    // been delivered too. Only then does a new chart open: showing a window calls off a quit
+    // still waiting to be delivered.
+    QTimer poll;
+    QObject::connect(&poll, &QTimer::timeout, [&] {
+        if (!chart.isNull())
+            return;
+        poll.stop();
+        stillRunning = true;
+        Message open(kNewUniverseWindow);
+        controls->MessageReceived(&open);
+        chartsAfter = controls->UniverseWindows().size();
+        controls->close();
+    });
+    poll.start(10);
+    bool timedOut = false;
+    QTimer guard; // ends a run that would not end, and goes away with this test
+    guard.setSingleShot(true);
+    QObject::connect(&guard, &QTimer::timeout, [&] {
+        timedOut = true;
+        QCoreApplication::quit();
+    });
+    guard.start(10000);
+    EXPECT_EQ(application->Run(), 0);
+    EXPECT_TRUE(stillRunning) << "closing the only chart ended the program";
+    EXPECT_EQ(chartsAfter, 1);
+    EXPECT_FALSE(timedOut) << "closing the controls did not end the program";
     delete application;
 }

@@ -111,6 +111,30 @@ TEST_F(ControlWindowTest, TheControlsFollowTheChartActivatedLast)
     QCoreApplication::sendPostedEvents(nullptr, QEvent::DeferredDelete);
 }
 
+TEST_F(ControlWindowTest, ANewChartAfterTheLastOneClosedTakesTheControls)
+{
+    ControlWindow controls(BPoint(90, 60), "3D Nightdome");
+    controls.UniverseWindows()[0]->close();
+    DeliverPostedMessages();
+    ASSERT_TRUE(controls.UniverseWindows().isEmpty());
+    ASSERT_EQ(controls.LinkedWindow(), nullptr);
+
+    // Nothing was driven, so the new chart is, without waiting to be activated.
+    QTest::mouseClick(controls.findChild<IPictureButton*>("New Nightdome Button"), Qt::LeftButton);
+    DeliverPostedMessages();
+    ASSERT_EQ(controls.UniverseWindows().size(), 1);
+    UniverseWindow* fresh = controls.UniverseWindows()[0];
+    EXPECT_EQ(controls.LinkedWindow(), fresh);
+    EXPECT_TRUE(LinkedTo(controls, ViewOf(fresh)));
+
+    // A chart opened while another is driven waits for its activation.
+    QTest::mouseClick(controls.findChild<IPictureButton*>("New Nightdome Button"), Qt::LeftButton);
+    DeliverPostedMessages();
+    ASSERT_EQ(controls.UniverseWindows().size(), 2);
+    EXPECT_TRUE(LinkedTo(controls, ViewOf(fresh)));
+    QCoreApplication::sendPostedEvents(nullptr, QEvent::DeferredDelete);
+}
+
 TEST_F(ControlWindowTest, AMissingCatalogueStillOpensAnEmptyChart)
 {
     std::filesystem::remove(ExecutableDirectory() / "stars.dat");
