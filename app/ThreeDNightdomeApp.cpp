@@ -16,6 +16,8 @@ ThreeDNightdomeApp::ThreeDNightdomeApp(int& argc, char** argv)
     // also quit when the last chart closes: the control window is a tool window, which Qt does
     // not count among the windows that keep a program running.
     QGuiApplication::setQuitOnLastWindowClosed(false);
+    // Before the first window exists, so that every window is on the screen's default colormap.
+    QCoreApplication::instance()->installEventFilter(&fColormaps);
     // The tables are written here, before any window or render thread exists, and only read
     // afterwards.
     gSpectralCTable = BuildSpectralTables();

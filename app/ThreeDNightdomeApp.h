@@ -2,6 +2,7 @@
 // the control window, which opens everything else.
 #pragma once
 
+#include "app/DefaultColormapFilter.h"
 #include "controls/ControlWindow.h"
 #include "platform/qt/Messaging.h"
 
@@ -32,5 +33,6 @@ public:
 
 private:
     std::unique_ptr<QApplication> fApplication; // owned when this object made it
+    DefaultColormapFilter fColormaps; // watches every window the program creates
     QPointer<ControlWindow> fControlWindow;
 };

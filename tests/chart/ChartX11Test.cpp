@@ -1,5 +1,6 @@
 // A chart window on a real X server (Xvfb), worked with xdotool as a person would: hovering a
-// star, clicking it twice and dragging it to another window.
+// star, clicking it twice and dragging it to another window; and two charts at one place, each
+// showing its own frame when it is on top.
 #include "ChartFixture.h"
 #include "X11Support.h"
 
@@ -8,7 +9,38 @@
 #include "platform/qt/RecordingHandler.h"
 #include "widgets/InfoView.h"
 
+#include <QScreen>
 #include <QTest>
+
+namespace {
+
+// The screen's own pixels over widget (one GetImage of the root window).
+QImage OnScreen(const QWidget* widget)
+{
+    const QPoint at = widget->mapToGlobal(QPoint(0, 0));
+    return QGuiApplication::primaryScreen()
+        ->grabWindow(0, at.x(), at.y(), widget->width(), widget->height())
+        .toImage()
+        .convertToFormat(QImage::Format_RGB32);
+}
+
+// A view's last finished frame in the colours the screen shows.
+QImage Shown(UniverseView* view)
+{
+    return view->FrontImage().convertToFormat(QImage::Format_RGB32);
+}
+
+int LitPixels(const QImage& image)
+{
+    int lit = 0;
+    for (int y = 0; y < image.height(); y++) {
+        for (int x = 0; x < image.width(); x++)
+            lit += qGray(image.pixel(x, y)) > 20;
+    }
+    return lit;
+}
+
+} // namespace
 
 TEST_F(ChartTest, AStarHoveredClickedTwiceAndDraggedToAnotherWindow)
 {
@@ -93,5 +125,60 @@ TEST_F(ChartTest, AStarHoveredClickedTwiceAndDraggedToAnotherWindow)
     EXPECT_EQ(target->received->DropPoint().y, to.y());
 
     window->close();
+    QCoreApplication::sendPostedEvents(nullptr, QEvent::DeferredDelete);
+}
+
+TEST_F(ChartTest, TwoChartsAtOnePlaceEachShowItsOwnFrameOnTop)
+{
+    if (QGuiApplication::platformName() != "xcb")
+        GTEST_SKIP() << "needs an X server: run under scripts/with-xvfb";
+    Universe* universe = MakeUniverse({
+        { "The Sun", 0, 0, 0, 4.83 },
+        { "Sirius", -0.494, -0.759, 2.477, 1.454, "A0" },
+        { "Procyon", -1.365, 0.320, 3.228, 2.68, "F5" },
+        { "Altair", 2.54, 0.87, -4.31, 2.22, "A7" },
+        { "Vega", 1.0, 4.9, -5.0, 0.58, "A0" },
+    });
+    QWidget controls;
+    controls.setGeometry(900, 50, 320, 60);
+    auto* help = new InfoView(BRect(0, 20, 319, 39), "Info View", "", &controls);
+    controls.show();
+
+    // The second opens exactly over the first. Both stand still, and they differ: the one on
+    // top has no clipping overlay.
+    auto* below = new UniverseWindow(BPoint(90, 140), 328, 340, "Nightdome", help, universe);
+    auto* above = new UniverseWindow(BPoint(90, 140), 328, 340, "Nightdome", help, universe);
+    ASSERT_EQ(above->geometry(), below->geometry());
+    *below->View()->GetRadialVelocityY() = 0;
+    *above->View()->GetRadialVelocityY() = 0;
+    Message toggle(kClipToggle);
+    above->View()->MessageReceived(&toggle);
+    ASSERT_TRUE(QTest::qWaitForWindowExposed(below));
+    ASSERT_TRUE(QTest::qWaitForWindowExposed(above));
+    // Frames drawn after the change, so that each view's frame is its still picture.
+    const int64_t belowFrames = below->View()->FramesRendered();
+    const int64_t aboveFrames = above->View()->FramesRendered();
+    ASSERT_TRUE(QTest::qWaitFor(
+        [&] {
+            return below->View()->FramesRendered() > belowFrames + 2
+                && above->View()->FramesRendered() > aboveFrames + 2;
+        },
+        10000));
+    ASSERT_NE(Shown(above->View()), Shown(below->View()));
+
+    // On the screen the place shows the top chart's own frame, stars and all.
+    EXPECT_TRUE(
+        QTest::qWaitFor([&] { return OnScreen(above->View()) == Shown(above->View()); }, 10000));
+    EXPECT_NE(OnScreen(above->View()), Shown(below->View()));
+    EXPECT_GT(LitPixels(OnScreen(above->View())), 20);
+
+    // Raised, the other chart shows its own.
+    below->raise();
+    EXPECT_TRUE(
+        QTest::qWaitFor([&] { return OnScreen(below->View()) == Shown(below->View()); }, 10000));
+    EXPECT_GT(LitPixels(OnScreen(below->View())), 20);
+
+    above->close();
+    below->close();
     QCoreApplication::sendPostedEvents(nullptr, QEvent::DeferredDelete);
 }
