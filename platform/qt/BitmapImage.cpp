@@ -30,3 +30,24 @@ QPixmap DragPixmap(RBitmap8& bitmap)
 {
     return QPixmap::fromImage(ImageOf(bitmap).convertToFormat(QImage::Format_ARGB32));
 }
+
+QRegion OpaqueRegion(const RBitmap8& bitmap)
+{
+    // One rectangle for each run of opaque pixels in a row; drag images are 32 x 32, so the
+    // handful of unions costs nothing.
+    QRegion region;
+    const uint8_t* row = bitmap.Bits();
+    for (int32_t y = 0; y < bitmap.Height(); ++y, row += bitmap.BytesPerRow()) {
+        int32_t x = 0;
+        while (x < bitmap.Width()) {
+            while (x < bitmap.Width() && row[x] == 255)
+                ++x;
+            const int32_t start = x;
+            while (x < bitmap.Width() && row[x] != 255)
+                ++x;
+            if (x > start)
+                region += QRect(start, y, x - start, 1);
+        }
+    }
+    return region;
+}

@@ -6,6 +6,7 @@
 #include <QImage>
 #include <QList>
 #include <QPixmap>
+#include <QRegion>
 
 class RBitmap8;
 
@@ -18,3 +19,7 @@ QImage ImageOf(RBitmap8& bitmap);
 
 // A drag image: a pixmap copy of bitmap with index 255 transparent.
 QPixmap DragPixmap(RBitmap8& bitmap);
+
+// The pixels of bitmap that are not index 255, in bitmap coordinates: the outline a window
+// without an alpha channel is cut to so that it shows only the picture.
+QRegion OpaqueRegion(const RBitmap8& bitmap);

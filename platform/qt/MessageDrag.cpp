@@ -4,9 +4,55 @@
 #include "platform/qt/BitmapImage.h"
 #include "render/RBitmap8.h"
 
+#include <QCoreApplication>
 #include <QDrag>
 #include <QDropEvent>
 #include <QWidget>
+#include <QWindow>
+
+namespace {
+
+// Qt shows a drag's picture in a small window of its own, a QShapedPixmapWindow. Where a
+// compositing manager runs, that window's alpha channel makes index 255 see-through. Where none
+// runs (a bare X server, or one under openbox, which does not composite) Qt does not count on
+// the alpha channel: the window paints the palette's base colour, white, under the picture and
+// is meant to be cut to the picture's outline. Qt 6.4 asks for that outline before the window
+// exists, so it is lost and the picture shows on a white square. This filter cuts the window
+// itself when it is shown (it exists by then and is not yet on the screen) and again whenever
+// it is exposed; with a compositor the outline changes nothing.
+class DragImageShaper : public QObject {
+public:
+    DragImageShaper(const RBitmap8& image, QDrag* drag)
+        : QObject(drag)
+        , fShape(OpaqueRegion(image))
+    {
+        if (QCoreApplication* application = QCoreApplication::instance())
+            application->installEventFilter(this);
+    }
+
+    ~DragImageShaper() override
+    {
+        if (QCoreApplication* application = QCoreApplication::instance())
+            application->removeEventFilter(this);
+    }
+
+protected:
+    bool eventFilter(QObject* watched, QEvent* event) override
+    {
+        if ((event->type() == QEvent::Show || event->type() == QEvent::Expose)
+            && watched->isWindowType() && watched->inherits("QShapedPixmapWindow")) {
+            auto* window = static_cast<QWindow*>(watched);
+            if (window->mask() != fShape)
+                window->setMask(fShape);
+        }
+        return false;
+    }
+
+private:
+    QRegion fShape; // the picture's opaque pixels, in its own (device-independent) pixels
+};
+
+} // namespace
 
 MessageMimeData::MessageMimeData(const Message& message)
     : fMessage(message)
@@ -21,6 +67,7 @@ QDrag* MakeMessageDrag(QWidget* source, const Message& message, RBitmap8* image,
     drag->setMimeData(new MessageMimeData(message));
     if (image) {
         drag->setPixmap(DragPixmap(*image));
+        new DragImageShaper(*image, drag); // owned by the drag, lives as long as it does
         drag->setHotSpot(QPoint(static_cast<int>(hotSpot.x), static_cast<int>(hotSpot.y)));
     }
     return drag;

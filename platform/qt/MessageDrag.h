@@ -27,8 +27,8 @@ private:
 };
 
 // Builds the drag of message from source, its picture the image (palette index 255
-// transparent), held at hotSpot (bitmap coordinates). The caller runs it with exec(); headless
-// tests look at what it carries instead.
+// transparent, with or without a compositing manager), held at hotSpot (bitmap coordinates). The
+// caller runs it with exec(); headless tests look at what it carries instead.
 QDrag* MakeMessageDrag(QWidget* source, const Message& message, RBitmap8* image, BPoint hotSpot);
 
 // Builds the drag and runs it until the button is let go; returns what happened to it.

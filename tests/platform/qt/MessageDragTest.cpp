@@ -1,6 +1,7 @@
 #include "platform/qt/RecordingHandler.h"
 
 #include "core/MessageCodes.h"
+#include "platform/qt/BitmapImage.h"
 #include "platform/qt/MessageDrag.h"
 #include "render/RBitmap8.h"
 
@@ -35,6 +36,25 @@ TEST(MessageDrag, ADragCarriesTheMessageAndItsPicture)
     EXPECT_EQ(picture.pixel(15, 15), qRgba(255, 255, 255, 255));
     EXPECT_EQ(qAlpha(picture.pixel(10, 15)), 0);
     delete drag;
+}
+
+TEST(MessageDrag, APictureIsCutToItsOpaquePixels)
+{
+    RBitmap8 image(BRect(0, 0, 31, 31));
+    image.EraseMap(255);
+    image.RenderSquare(11, 11, 10, 63);
+    image.RenderPoint(30, 2, 0); // index 0 (black) is opaque like any other colour but 255
+    image.RenderPoint(31, 31, 254);
+    const QRegion outline = OpaqueRegion(image);
+    QRegion expected(11, 11, 10, 10);
+    expected += QRect(30, 2, 1, 1);
+    expected += QRect(31, 31, 1, 1);
+    EXPECT_EQ(outline, expected);
+
+    image.EraseMap(255);
+    EXPECT_TRUE(OpaqueRegion(image).isEmpty());
+    image.EraseMap(7);
+    EXPECT_EQ(OpaqueRegion(image), QRegion(0, 0, 32, 32));
 }
 
 TEST(MessageDrag, ADropGivesBackTheMessageMarkedDroppedWhereItWasLetGo)
