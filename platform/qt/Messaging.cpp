@@ -1,5 +1,8 @@
-// Message posting through Qt's event queue, dispatched by one application-wide filter.
+// Message posting through Qt's event queue, dispatched by one application-wide filter, and
+// through the mailbox from other threads.
 #include "platform/qt/Messaging.h"
+
+#include "platform/qt/ThreadMailbox.h"
 
 #include <QCoreApplication>
 #include <QThread>
@@ -71,6 +74,24 @@ bool PostMessage(QObject* target, const Message& message)
     return true;
 }
 
+bool PostMessage(const QPointer<QObject>& target, const Message& message)
+{
+    if (target.isNull() || !QCoreApplication::instance())
+        return false;
+    ThreadMailbox& mailbox = ThreadMailbox::Instance();
+    // On the application's thread the target cannot die before the post: post it as usual.
+    if (mailbox.OnApplicationThread())
+        return PostMessage(target.data(), message);
+    // Elsewhere only the guard travels; it is read where handlers are deleted.
+    mailbox.Post([target, message] {
+        if (auto* handler = dynamic_cast<BHandler*>(target.data())) {
+            Message delivered = message;
+            handler->MessageReceived(&delivered);
+        }
+    });
+    return true;
+}
+
 bool PostMessageToView(QWidget* window, const char* viewName, const Message& message)
 {
     if (!window)
@@ -81,6 +102,10 @@ bool PostMessageToView(QWidget* window, const char* viewName, const Message& mes
 void DeliverPostedMessages()
 {
     // Everything posted, in order: a dispatcher whose installation was queued from another
-    // thread must be in place before the messages behind it.
-    QCoreApplication::sendPostedEvents();
+    // thread must be in place before the messages behind it. Work from the mailbox may post in
+    // turn, and the other way round.
+    ThreadMailbox& mailbox = ThreadMailbox::Instance();
+    do
+        QCoreApplication::sendPostedEvents();
+    while (mailbox.Deliver() > 0);
 }

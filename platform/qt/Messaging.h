@@ -6,6 +6,7 @@
 
 #include <QEvent>
 #include <QObject>
+#include <QPointer>
 
 class QWidget;
 
@@ -25,10 +26,18 @@ public:
     Message message;
 };
 
-// Posts a copy of message to target. Returns false, posting nothing, when target is null
-// (a handler whose window has closed, held in a QPointer, reads as null). A handler deleted
-// before the event loop gets to the message never receives it.
+// Posts a copy of message to target. Returns false, posting nothing, when target is null.
+// A handler deleted before the event loop gets to the message never receives it. Only for the
+// application's own thread, where handlers are deleted: anywhere else the pointer may die
+// between the caller's check and the post.
 bool PostMessage(QObject* target, const Message& message);
+
+// The same from any thread (the render threads broadcast this way). Off the application's
+// thread the message goes through the mailbox with its own guarded copy of target, which is
+// looked at only on the application's thread, when the message is delivered: a handler
+// deleted meanwhile is skipped instead of written to. False when target is already gone or
+// there is no application.
+bool PostMessage(const QPointer<QObject>& target, const Message& message);
 
 // Posts to the view of window whose object name is viewName; false when there is none.
 bool PostMessageToView(QWidget* window, const char* viewName, const Message& message);
