@@ -57,6 +57,7 @@ UniverseView::UniverseView(
     fViewWidth = width();
     fViewHeight = height();
 
+    fSelf = this;
     fPressTimer.setInterval(50);
     connect(&fPressTimer, &QTimer::timeout, this, [this] { SamplePress(); });
 }
@@ -116,12 +117,20 @@ void UniverseView::paintEvent(QPaintEvent*)
     std::unique_lock lock(fHandOver, std::try_to_lock);
     if (!lock.owns_lock() || fFront.empty())
         return;
-    const QImage image(
-        fFront.data(), fFrontWidth, fFrontHeight, fFrontPitch, QImage::Format_Indexed8);
-    QImage shown = image;
-    shown.setColorTable(SystemColorTable());
+    // The palette look-up is done here, on this thread: handed an indexed image, Qt converts
+    // large ones on its own worker threads.
+    if (fShown.width() != fFrontWidth || fShown.height() != fFrontHeight)
+        fShown = QImage(fFrontWidth, fFrontHeight, QImage::Format_RGB32);
+    const QRgb* palette = SystemColorTable().constData();
+    for (int32_t y = 0; y < fFrontHeight; y++) {
+        const uint8_t* from = fFront.data() + size_t(y) * size_t(fFrontPitch);
+        auto* to = reinterpret_cast<QRgb*>(fShown.scanLine(y));
+        for (int32_t x = 0; x < fFrontWidth; x++)
+            to[x] = palette[from[x]];
+    }
+    lock.unlock();
     QPainter painter(this);
-    painter.drawImage(QPoint(0, 0), shown);
+    painter.drawImage(QPoint(0, 0), fShown);
 }
 
 void UniverseView::resizeEvent(QResizeEvent*)

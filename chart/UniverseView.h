@@ -30,6 +30,8 @@
 #include "render/RBitmap8.h"
 #include "widgets/IBroadcaster.h"
 
+#include <QImage>
+#include <QPointer>
 #include <QTimer>
 #include <atomic>
 #include <functional>
@@ -93,6 +95,8 @@ public:
     void Resume();
     void Suspend();
     bool IsRunning() const { return running.load(); }
+    // True while the frame loop is paused, waiting to be resumed.
+    bool IsSuspended() const { return fSuspended.load(); }
     // Frames finished since the loop started; for tests and measurements.
     int64_t FramesRendered() const { return framesRendered.load(); }
 
@@ -121,6 +125,10 @@ public:
     {
         fDragStarter = std::move(starter);
     }
+    // Called by every worker thread as it begins its share of a frame, with the share's index,
+    // once it holds the bitmap it draws into; for tests that hold a worker back. Set it before
+    // the render threads start.
+    void SetShareHook(std::function<void(int32_t)> hook) { fShareHook = std::move(hook); }
 
 protected:
     void MouseMoved(QPoint where, Transit transit) override;
@@ -145,7 +153,8 @@ private:
     void RebuildDrawMask();
     // The star pass over begin, begin + step, ... below end: a transform-and-cull pass the
     // compiler vectorises, then the drawing of what is on screen.
-    void RenderSpan(int32_t begin, int32_t end, int32_t step);
+    void RenderSpan(RBitmap8* target, int32_t begin, int32_t end, int32_t step);
+    void RenderShareInto(RBitmap8* target, int32_t shares, int32_t share);
     void DrawClipCube();
     void DrawReadout();
     std::string FormatReadout() const;
@@ -160,6 +169,9 @@ private:
     void StartWorkers();
     void StopWorkers();
     void DrawShares();
+    // After a frame whose wait for the shares timed out: waits for the late shares, so that
+    // nothing a worker may still draw into is erased, replaced or freed.
+    void CollectMissingShares();
     void Blit();
     void ReplaceOffscreen();
 
@@ -223,6 +235,11 @@ public:
 private:
     std::mutex fSuspendLock; // with fSuspendChanged: where the main render thread pauses
     std::condition_variable fSuspendChanged;
+    std::atomic<bool> fSuspended { false };
+    // A share of the last frame was still being drawn when its wait timed out; only whoever
+    // draws frames touches it.
+    bool fSharesMissing = false;
+    std::function<void(int32_t)> fShareHook;
     std::atomic<int64_t> framesRendered { 0 };
     std::atomic<int32_t> fViewWidth { 0 }, fViewHeight { 0 }; // the widget's size, for resizes
     // What the star pass reads of each system, packed: the universe never changes, and reading
@@ -231,6 +248,9 @@ private:
     std::vector<const ColorTable*> fTables; // not owned
     mutable TimedLock fHandOver; // guards fFront and its size
     std::vector<uint8_t> fFront; // the last frame shown: rows of fFrontPitch bytes
+    std::atomic<bool> fUpdatePending { false }; // a paint is asked for and not yet done
+    QPointer<UniverseView> fSelf; // made on the interface thread, copied by the render thread
+    QImage fShown; // the front buffer in colour, as painted; the interface thread's own
     int32_t fFrontWidth = 0, fFrontHeight = 0, fFrontPitch = 0;
     // A press in progress: the target it began on and where, sampled every 50 ms.
     QTimer fPressTimer;

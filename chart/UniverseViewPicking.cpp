@@ -201,8 +201,9 @@ void UniverseView::BroadcastSI(int32_t selection, int32_t target)
             message.AddInt32(kSISelectionIndexString, selection);
         if (flags & kSIWithUniverse)
             message.AddPointer(kSIUniversePointerString, universe);
-        if (subscriber->looper)
-            PostMessage(subscriber->handler, message);
+        // The subscriber may be deleted on the interface thread at any moment: only its guarded
+        // pointer travels, and it is looked at where the message is delivered.
+        PostMessage(subscriber->handler, message);
     }
 }
 

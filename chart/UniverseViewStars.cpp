@@ -28,21 +28,26 @@ constexpr int32_t kChunk = 256;
 
 void UniverseView::RenderStars(int32_t stride, int32_t start)
 {
-    RenderSpan(start, drawMask->GetSystemCount(), std::max(stride, 1));
+    RenderSpan(offscreen, start, drawMask->GetSystemCount(), std::max(stride, 1));
 }
 
 void UniverseView::RenderShare(int32_t shares, int32_t share)
 {
-    if (!interleaveBlocks) {
-        RenderStars(shares, share);
-        return;
-    }
-    const int32_t count = drawMask->GetSystemCount();
-    for (int32_t block = share * kShareBlock; block < count; block += shares * kShareBlock)
-        RenderSpan(block, std::min(block + kShareBlock, count), 1);
+    RenderShareInto(offscreen, shares, share);
 }
 
-void UniverseView::RenderSpan(int32_t begin, int32_t end, int32_t step)
+void UniverseView::RenderShareInto(RBitmap8* target, int32_t shares, int32_t share)
+{
+    const int32_t count = drawMask->GetSystemCount();
+    if (!interleaveBlocks) {
+        RenderSpan(target, share, count, std::max(shares, 1));
+        return;
+    }
+    for (int32_t block = share * kShareBlock; block < count; block += shares * kShareBlock)
+        RenderSpan(target, block, std::min(block + kShareBlock, count), 1);
+}
+
+void UniverseView::RenderSpan(RBitmap8* target, int32_t begin, int32_t end, int32_t step)
 {
     end = std::min({ end, int32_t(fPositionX.size()), drawMask->GetSystemCount() });
     const auto& m = transform.m;
@@ -112,10 +117,10 @@ void UniverseView::RenderSpan(int32_t begin, int32_t end, int32_t step)
             if (table && b < 16.0) {
                 const auto brightness = static_cast<int32_t>(b);
                 if (brightness >= 1)
-                    offscreen->RenderPointAdd(sx, sy, table, uint8_t(8 * brightness));
+                    target->RenderPointAdd(sx, sy, table, uint8_t(8 * brightness));
             } else if (table) {
                 const int32_t size = GlowSize(b);
-                offscreen->RenderBitmapAdd(sx - size / 2, sy - size / 2, starSprite, size, table);
+                target->RenderBitmapAdd(sx - size / 2, sy - size / 2, starSprite, size, table);
             }
             if (i == selected) {
                 selectedPointX.store(float(sx), std::memory_order_relaxed);

@@ -3,8 +3,8 @@
 #include "chart/UniverseView.h"
 
 #include "platform/Kernel.h"
+#include "platform/qt/ThreadMailbox.h"
 
-#include <QMetaObject>
 #include <chrono>
 #include <pthread.h>
 #include <string>
@@ -85,16 +85,28 @@ void UniverseView::ReplaceOffscreen()
 void UniverseView::DrawShares()
 {
     // The workers draw their shares while this thread draws its own; one unit of renderSync for
-    // each share, the wait bounded at two seconds.
+    // each share, the wait bounded at two seconds. After a time-out the frame goes on with what
+    // is drawn, and the units still to come are collected before the next frame.
     for (int32_t k = 1; k < threadCount; k++)
         workerParks[k].Resume();
     RenderShare(threadCount, 0);
     release_sem(renderSync);
-    acquire_sem_etc(renderSync, threadCount, B_RELATIVE_TIMEOUT, 2000000);
+    fSharesMissing
+        = acquire_sem_etc(renderSync, threadCount, B_RELATIVE_TIMEOUT, 2000000) == B_TIMED_OUT;
+}
+
+void UniverseView::CollectMissingShares()
+{
+    // A timed-out acquisition takes nothing, so every share of that frame still owes its unit.
+    if (!fSharesMissing)
+        return;
+    acquire_sem_etc(renderSync, threadCount, 0, 0);
+    fSharesMissing = false;
 }
 
 void UniverseView::Render()
 {
+    CollectMissingShares();
     renderLock->Acquire();
     RenderBackground();
     if (running) {
@@ -127,6 +139,7 @@ void UniverseView::StopWorkers()
 {
     if (!workersStarted)
         return;
+    CollectMissingShares();
     for (int32_t k = 1; k < threadCount; k++) {
         workerParks[k].Release();
         renderThreads[k - 1].join();
@@ -139,7 +152,10 @@ void UniverseView::StopWorkers()
 void UniverseView::RenderLoop(int32_t index)
 {
     while (workerParks[index].Park()) {
-        RenderShare(threadCount, index);
+        RBitmap8* target = offscreen;
+        if (fShareHook)
+            fShareHook(index);
+        RenderShareInto(target, threadCount, index);
         release_sem(renderSync);
     }
 }
@@ -153,10 +169,18 @@ void UniverseView::Blit()
     fFrontHeight = offscreen->Height();
     fFrontPitch = offscreen->BytesPerRow();
     fFront.assign(offscreen->Bits(), offscreen->Bits() + offscreen->BitsLength());
-    const bool resized = frameResized.exchange(false);
+    // A late worker may still draw into the offscreen: then the resize waits for a later frame.
+    const bool resized = !fSharesMissing && frameResized.exchange(false);
     fHandOver.unlock();
-    QMetaObject::invokeMethod(
-        this, [this] { update(); }, Qt::QueuedConnection);
+    // One paint request at a time; the interface thread asks for the next frame when it paints.
+    if (!fUpdatePending.exchange(true)) {
+        ThreadMailbox::Instance().Post([view = fSelf] {
+            if (view) {
+                view->fUpdatePending = false;
+                view->update();
+            }
+        });
+    }
 
     // A resize takes effect after a frame was shown: until then the old offscreen is drawn.
     if (resized) {
@@ -179,6 +203,7 @@ void UniverseView::MainRenderLoop()
 
     while (running) {
         const bigtime_t t0 = system_time();
+        CollectMissingShares();
         renderLock->Acquire();
         // The settings the controls write are read once a frame.
         const double filter = distanceFilter.load(std::memory_order_relaxed);
@@ -211,7 +236,9 @@ void UniverseView::MainRenderLoop()
             snooze(15000 - dt);
         if (suspendRequested) {
             std::unique_lock lock(fSuspendLock);
+            fSuspended = true;
             fSuspendChanged.wait(lock, [&] { return !suspendRequested || !running; });
+            fSuspended = false;
         }
     }
 

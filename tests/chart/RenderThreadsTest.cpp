@@ -102,24 +102,26 @@ TEST_F(UniverseViewTest, ASuspendedChartDrawsNothingUntilResumed)
     UniverseView* view = MakeView(u);
     view->AttachedToWindow();
     ASSERT_TRUE(WaitForFrames(view, 2));
+    view->cameraVelocityZ = 0.5; // the camera moves out a little every frame
+    const int64_t moving = view->FramesRendered();
+    ASSERT_TRUE(WaitForFrames(view, moving + 2));
     view->Suspend();
     // It finishes the frame it is in, then waits.
-    int64_t settled = -1;
-    ASSERT_TRUE(QTest::qWaitFor(
-        [&] {
-            const int64_t now = view->FramesRendered();
-            QTest::qWait(60); // four frame times
-            const bool still = view->FramesRendered() == now;
-            settled = now;
-            return still;
-        },
-        5000));
+    ASSERT_TRUE(QTest::qWaitFor([&] { return view->IsSuspended(); }, 5000));
+    const int64_t settled = view->FramesRendered();
+    view->renderLock->Acquire();
     const double distance = view->cameraDistance;
-    QTest::qWait(200);
+    view->renderLock->Release();
+    ASSERT_GT(distance, 25.0);
+    // Paused: the main render thread waits to be resumed, so no frame can follow.
+    EXPECT_TRUE(view->IsSuspended());
     EXPECT_EQ(view->FramesRendered(), settled);
     view->Resume();
     EXPECT_TRUE(WaitForFrames(view, settled + 3));
-    EXPECT_EQ(view->cameraDistance, distance); // nothing of the camera was lost
+    EXPECT_FALSE(view->IsSuspended());
+    view->DetachedFromWindow();
+    // The camera went on from where it stood, still moving out a little.
+    EXPECT_GT(view->cameraDistance, distance);
     view->DetachedFromWindow();
 }
 
@@ -130,7 +132,7 @@ TEST_F(UniverseViewTest, ClosingASuspendedChartEndsAllItsThreads)
     view->AttachedToWindow();
     ASSERT_TRUE(WaitForFrames(view, 2));
     view->Suspend();
-    QTest::qWait(100);
+    ASSERT_TRUE(QTest::qWaitFor([&] { return view->IsSuspended(); }, 5000));
     auto stopped = std::async(std::launch::async, [&] { view->DetachedFromWindow(); });
     ASSERT_EQ(stopped.wait_for(5s), std::future_status::ready);
     EXPECT_EQ(Count(ThreadNames(), "Main Render Thr"), 0);

@@ -13,15 +13,18 @@
 
 namespace {
 
+// The chart finished its frame and its main render thread waits to be resumed.
 bool FramesStop(UniverseView* view)
 {
-    return QTest::qWaitFor(
-        [&] {
-            const int64_t now = view->FramesRendered();
-            QTest::qWait(60);
-            return view->FramesRendered() == now;
-        },
-        5000);
+    return QTest::qWaitFor([&] { return view->IsSuspended(); }, 5000);
+}
+
+double CameraDistance(UniverseView* view)
+{
+    view->renderLock->Acquire();
+    const double distance = view->cameraDistance;
+    view->renderLock->Release();
+    return distance;
 }
 
 bool FramesRun(UniverseView* view)
@@ -95,15 +98,18 @@ TEST_F(UniverseWindowTest, MinimisingStopsTheChartAndRestoringGoesOn)
         = new UniverseWindow(BPoint(90, 140), 328, 340, "Nightdome", &controller, universe);
     UniverseView* view = window->View();
     ASSERT_TRUE(FramesRun(view));
+    view->renderLock->Acquire();
     view->cameraDistance = 12.5;
+    view->renderLock->Release();
     window->showMinimized();
     ASSERT_TRUE(FramesStop(view));
     const int64_t frames = view->FramesRendered();
-    QTest::qWait(200);
-    EXPECT_EQ(view->FramesRendered(), frames);
+    EXPECT_EQ(CameraDistance(view), 12.5);
+    EXPECT_EQ(view->FramesRendered(), frames); // no frame while it waits
     window->showNormal();
     EXPECT_TRUE(FramesRun(view));
-    EXPECT_EQ(view->cameraDistance, 12.5);
+    EXPECT_FALSE(view->IsSuspended());
+    EXPECT_EQ(CameraDistance(view), 12.5); // nothing moves it: the camera is where it was
 
     window->hide();
     EXPECT_TRUE(FramesStop(view));
