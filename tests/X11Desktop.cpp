@@ -64,12 +64,19 @@ int Channel(uint32_t pixel, uint32_t mask)
 
 bool WindowManager::Start(int timeoutMs)
 {
-    fProcess.setStandardOutputFile(QProcess::nullDevice());
+    // openbox takes the screen early in its start-up, and a window mapped before the end of it
+    // can be left unmanaged, never shown: so it is asked to say when it is done.
     fProcess.setStandardErrorFile(QProcess::nullDevice()); // it complains of a missing menu
-    fProcess.start("openbox", { "--sm-disable" });
+    fProcess.start("openbox", { "--sm-disable", "--startup", "echo started" });
     if (!fProcess.waitForStarted(5000))
         return false;
-    return QTest::qWaitFor([] { return WindowManagerRunning(); }, timeoutMs);
+    QByteArray said;
+    return QTest::qWaitFor(
+        [&] {
+            said += fProcess.readAllStandardOutput();
+            return said.contains("started") && WindowManagerRunning();
+        },
+        timeoutMs);
 }
 
 void WindowManager::Stop()

@@ -13,8 +13,8 @@
 class WindowManager {
 public:
     ~WindowManager() { Stop(); }
-    // Starts openbox and waits, at most timeoutMs, until it manages the screen; false when it did
-    // not start or never took over.
+    // Starts openbox and waits, at most timeoutMs, until it manages the screen and has finished
+    // starting; false when it did not start or never took over.
     bool Start(int timeoutMs = 10000);
     // Ends openbox (its windows go back to the bare root) and waits for it to be gone.
     void Stop();

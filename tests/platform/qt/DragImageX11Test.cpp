@@ -16,7 +16,6 @@
 #include <QImage>
 #include <QMouseEvent>
 #include <QPainter>
-#include <QProcess>
 #include <QScreen>
 #include <QTest>
 #include <QTimer>
@@ -121,34 +120,11 @@ protected:
         InitResources();
     }
 
-    void TearDown() override
-    {
-        if (fWindowManager.state() == QProcess::NotRunning)
-            return;
-        fWindowManager.terminate();
-        if (!fWindowManager.waitForFinished(5000)) {
-            fWindowManager.kill();
-            fWindowManager.waitForFinished(5000);
-        }
-    }
-
-    // Starts openbox and waits until it holds the screen and has finished starting: it takes
-    // the screen early in its start-up, and a window mapped before the end of it can be left
-    // unmanaged, never shown; so it is asked to say when it is done.
+    // Starts openbox and waits until it holds the screen and has finished starting.
     void StartOpenbox()
     {
         ASSERT_FALSE(WindowManagerRunning()) << "another window manager runs on this display";
-        fWindowManager.setStandardErrorFile(QProcess::nullDevice()); // it misses a menu file
-        fWindowManager.start("openbox", { "--sm-disable", "--startup", "echo started" });
-        ASSERT_TRUE(fWindowManager.waitForStarted(5000)) << "openbox is not installed";
-        QByteArray said;
-        ASSERT_TRUE(QTest::qWaitFor(
-            [&] {
-                said += fWindowManager.readAllStandardOutput();
-                return said.contains("started") && WindowManagerRunning();
-            },
-            10000))
-            << "openbox did not start";
+        ASSERT_TRUE(fWindowManager.Start()) << "openbox is not installed or did not start";
     }
 
     // Drags a star message with the picture 'Raw8' id over a window of kBeneath and, once the
@@ -201,7 +177,7 @@ protected:
     }
 
 private:
-    QProcess fWindowManager;
+    WindowManager fWindowManager;
 };
 
 } // namespace
