@@ -2,8 +2,8 @@
 // systems, write the program's catalogue, and describe what was done.
 #pragma once
 
+#include "tools/importer/CatalogueWriter.h"
 #include "tools/importer/ImportStar.h"
-#include "tools/importer/SystemGrouping.h"
 
 #include <string>
 

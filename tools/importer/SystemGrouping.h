@@ -1,9 +1,8 @@
-// Turning a list of stars into star systems, and writing them as the program's catalogue.
+// Turning a list of stars into star systems.
 #pragma once
 
 #include "tools/importer/ImportStar.h"
 
-#include <string>
 #include <vector>
 
 // Two stars are one system when they lie close together on the sky, at most
@@ -27,15 +26,3 @@ bool SameSystem(const ImportStar& a, const ImportStar& b);
 // Position in parsecs in the program's frame: x toward right ascension 0 h, z toward 6 h,
 // y toward the north celestial pole.
 void CartesianPosition(const ImportStar& star, double* x, double* y, double* z);
-
-struct WriteSummary {
-    int64_t systems = 0; // the Sun included
-    int64_t stars = 0; // the Sun included
-    std::vector<int64_t> systemsBySize; // [n] = systems of n stars
-};
-
-// Writes "The Sun" first, then every system with its stars at the position of its primary.
-// The text goes to a temporary file beside path that replaces path only when all is written,
-// so a failed run never leaves a partial catalogue. Throws ImportError when it cannot write.
-WriteSummary WriteCatalogue(const std::string& path, const std::vector<ImportStar>& stars,
-    const std::vector<StarGroup>& systems);
