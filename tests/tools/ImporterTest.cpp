@@ -2,6 +2,7 @@
 // files holding the same stars with their published values. Each import is read back through
 // the program's own catalogue reader.
 #include "tools/importer/Importer.h"
+#include "ImporterFixture.h"
 #include "NearbyStars.h"
 
 #include "catalog/Star.h"
@@ -24,42 +25,7 @@ namespace fs = std::filesystem;
 
 namespace {
 
-// A folder of its own for each test, removed at the end.
-class ImporterTest : public ::testing::Test {
-protected:
-    void SetUp() override
-    {
-        const auto* info = ::testing::UnitTest::GetInstance()->current_test_info();
-        fDir = fs::temp_directory_path()
-            / ("nightdome-import-" + std::to_string(getpid()) + "-" + info->name());
-        fs::create_directories(fDir);
-    }
-    void TearDown() override { fs::remove_all(fDir); }
-
-    std::string PathOf(const std::string& name) const { return (fDir / name).string(); }
-
-    std::string Write(const std::string& name, const std::string& text) const
-    {
-        std::ofstream(PathOf(name), std::ios::binary) << text;
-        return PathOf(name);
-    }
-
-    // Runs the command; returns its exit status and puts what it printed into output.
-    int Run(const std::string& arguments, std::string* output) const
-    {
-        const std::string command = std::string(ND_IMPORTER) + " " + arguments + " 2>&1";
-        std::unique_ptr<FILE, int (*)(FILE*)> pipe(popen(command.c_str(), "r"), pclose);
-        std::array<char, 4096> buffer;
-        output->clear();
-        size_t got;
-        while ((got = fread(buffer.data(), 1, buffer.size(), pipe.get())) > 0)
-            output->append(buffer.data(), got);
-        const int status = pclose(pipe.release());
-        return WIFEXITED(status) ? WEXITSTATUS(status) : -1;
-    }
-
-    fs::path fDir;
-};
+using ImporterTest = ImportFolder;
 
 const char* kHyg
     = "id,hip,hd,hr,gl,bf,proper,ra,dec,dist,pmra,pmdec,rv,mag,absmag,spect,ci,x,y,z\n"
