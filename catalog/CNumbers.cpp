@@ -15,15 +15,16 @@ bool IsDigit(char c)
     return c >= '0' && c <= '9';
 }
 
-// A plain decimal, one from_chars reads the way strtod does: an optional minus, then digits or
-// a point. Hexadecimal, which from_chars does not know, is left to the slow path.
-bool LooksDecimal(const char* p)
+// A plain decimal in [p, end), one from_chars reads the way strtod does: an optional minus,
+// then digits or a point. Hexadecimal, which from_chars does not know, is left to the slow
+// path. Nothing at or past end is looked at.
+bool LooksDecimal(const char* p, const char* end)
 {
-    if (*p == '-')
+    if (p < end && *p == '-')
         p++;
-    if (!IsDigit(*p) && *p != '.')
+    if (p == end || (!IsDigit(*p) && *p != '.'))
         return false;
-    return !(p[0] == '0' && (p[1] == 'x' || p[1] == 'X'));
+    return !(p[0] == '0' && end - p > 1 && (p[1] == 'x' || p[1] == 'X'));
 }
 
 // The "C" locale, so that a decimal point is a point whatever the user's locale says.
@@ -48,9 +49,10 @@ private:
 
 bool ScanDouble(const char* text, double* value, const char** next)
 {
-    if (LooksDecimal(text)) {
+    const char* textEnd = text + std::strlen(text);
+    if (LooksDecimal(text, textEnd)) {
         double result;
-        const auto [end, error] = std::from_chars(text, text + std::strlen(text), result);
+        const auto [end, error] = std::from_chars(text, textEnd, result);
         if (error == std::errc()) {
             *value = result;
             if (next)
@@ -86,7 +88,7 @@ int ScanCatalogueData(const char* line, const char* end, char* classText, double
     for (int i = 0; fast && i < 4; i++) {
         while (p < end && IsCSpace(*p))
             p++;
-        if (p == end || !LooksDecimal(p))
+        if (!LooksDecimal(p, end))
             break;
         const auto [after, error] = std::from_chars(p, end, values[i]);
         fast = error == std::errc() && (after == end || IsCSpace(*after));

@@ -22,19 +22,17 @@ namespace {
 constexpr size_t kMaxLine = 500;
 // Names are kept to this many characters.
 constexpr size_t kMaxName = 79;
-// One record is two lines and their two line feeds.
-constexpr size_t kMaxRecord = 2 * (kMaxLine + 1);
-// The file is read through a window of this size, so a catalogue of a million stars never
-// needs its whole text in memory at once.
-constexpr size_t kWindow = size_t(1) << 20;
+// One record is two lines and their two line ends (a line feed, or a carriage return and a
+// line feed).
+constexpr size_t kMaxRecord = 2 * (kMaxLine + 2);
 
 // The catalogue text seen through a sliding window that always holds a whole record when the
 // file has one left.
 class CatalogueText {
 public:
-    explicit CatalogueText(std::FILE* file)
+    CatalogueText(std::FILE* file, size_t window)
         : fFile(file)
-        , fBuffer(kWindow + kMaxRecord)
+        , fBuffer(window + kMaxRecord)
     {
         std::setvbuf(file, nullptr, _IONBF, 0);
     }
@@ -48,14 +46,25 @@ public:
     }
 
     // The next line: its characters up to the line feed, at most kMaxLine of them; the read
-    // position then steps over one more character.
+    // position then steps over one more character. A carriage return before the line feed
+    // belongs to the line end, so catalogues written with CR LF read as with LF alone.
     std::pair<const char*, size_t> Line()
     {
         const char* start = fBuffer.data() + std::min(fPosition, fLimit);
-        const size_t available = fPosition < fLimit ? std::min(kMaxLine, fLimit - fPosition) : 0;
+        const size_t left = fPosition < fLimit ? fLimit - fPosition : 0;
+        const size_t available = std::min(kMaxLine, left);
         const void* feed = std::memchr(start, '\n', available);
-        const size_t length = feed ? static_cast<const char*>(feed) - start : available;
-        fPosition += length + 1;
+        size_t length = feed ? static_cast<const char*>(feed) - start : available;
+        size_t step = length + 1;
+        if (feed || (length < left && start[length] == '\n')) {
+            // A line of at most kMaxLine characters before its line feed.
+            if (length > 0 && start[length - 1] == '\r')
+                length--;
+        } else if (length + 1 < left && start[length] == '\r' && start[length + 1] == '\n') {
+            // kMaxLine characters, then CR LF: one line end, not a split line.
+            step++;
+        }
+        fPosition += step;
         return { start, length };
     }
 
@@ -105,17 +114,9 @@ Universe::Universe(int32_t blockSize)
 {
 }
 
-Universe::Universe(const char* fileName, int32_t maxStars, int32_t blockSize)
-    : BList(blockSize)
+void ReadCatalogue(std::FILE* file, int32_t maxStars, Universe* universe, size_t window)
 {
-    if (!fileName)
-        return;
-    std::unique_ptr<std::FILE, int (*)(std::FILE*)> file(
-        std::fopen(CataloguePath(fileName).c_str(), "rb"), &std::fclose);
-    if (!file)
-        return;
-
-    CatalogueText text(file.get());
+    CatalogueText text(file, window);
     // The scan targets live across records: a line with fewer fields keeps the values the
     // record before it had.
     char classText[kMaxLine + 1] = "";
@@ -140,10 +141,21 @@ Universe::Universe(const char* fileName, int32_t maxStars, int32_t blockSize)
             const double luminosity = std::pow(2.512, 4.7 - magnitude);
             system = new StarSystem(
                 name, previous, luminosity, SpectralTableFor(star->spectralClass.harvardClass), 2);
-            AddItem(system);
+            universe->AddItem(system);
         }
         system->AddItem(star);
     }
+}
+
+Universe::Universe(const char* fileName, int32_t maxStars, int32_t blockSize)
+    : BList(blockSize)
+{
+    if (!fileName)
+        return;
+    std::unique_ptr<std::FILE, int (*)(std::FILE*)> file(
+        std::fopen(CataloguePath(fileName).c_str(), "rb"), &std::fclose);
+    if (file)
+        ReadCatalogue(file.get(), maxStars, this);
 }
 
 Universe::Universe(double radius, stellarDensity density, int32_t blockSize, Random random)

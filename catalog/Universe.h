@@ -7,7 +7,9 @@
 #include "core/Random.h"
 #include "platform/BList.h"
 
+#include <cstddef>
 #include <cstdint>
+#include <cstdio>
 
 // Densities of a generated universe; the value is a factor on the number of systems.
 enum stellarDensity : int32_t {
@@ -43,3 +45,13 @@ public:
 
     StarSystem* SystemAt(int32_t index) const { return static_cast<StarSystem*>(ItemAt(index)); }
 };
+
+// The catalogue is read through a window of this many bytes, so a catalogue of a million stars
+// never needs its whole text in memory at once.
+inline constexpr size_t kCatalogueWindow = size_t(1) << 20;
+
+// Reads catalogue records from file, from where it stands, and appends their systems to
+// universe, as the file constructor does; at most maxStars records. window is the size of the
+// reading window (tests and fuzzing make it small, to reach its edges often).
+void ReadCatalogue(
+    std::FILE* file, int32_t maxStars, Universe* universe, size_t window = kCatalogueWindow);

@@ -5,6 +5,7 @@
 #include <cmath>
 #include <cstdio>
 #include <cstring>
+#include <memory>
 #include <random>
 #include <string>
 
@@ -112,6 +113,32 @@ TEST(CNumbers, LineEndsAtItsEndPointerOrAtANul)
         3);
     EXPECT_EQ(f.x, 2);
     EXPECT_EQ(f.y, -1);
+}
+
+TEST(CNumbers, NothingPastTheLineIsLookedAt)
+{
+    // A line whose last character starts a number, in a buffer that ends one byte after it:
+    // a "0" there must not lead the scanner on to look for an "x" beyond the buffer.
+    for (const char* tail : { "-", "", "." }) {
+        std::string text = "K1V" + std::string(496, ' ') + tail;
+        text.resize(500, ' ');
+        const auto buffer = std::make_unique<char[]>(501);
+        std::memcpy(buffer.get(), text.data(), 500);
+        buffer[500] = '0';
+        Fields f {};
+        f.m = 7;
+        EXPECT_EQ(
+            ScanCatalogueData(buffer.get(), buffer.get() + 500, f.word, &f.m, &f.x, &f.y, &f.z), 1)
+            << "tail '" << tail << "'";
+        EXPECT_STREQ(f.word, "K1V");
+        EXPECT_EQ(f.m, 7);
+    }
+    // The same for a number on its own that ends its buffer.
+    const auto minus = std::make_unique<char[]>(1);
+    minus[0] = '-';
+    Fields f {};
+    EXPECT_EQ(ScanCatalogueData(minus.get(), minus.get() + 1, f.word, &f.m, &f.x, &f.y, &f.z), 1);
+    EXPECT_STREQ(f.word, "-");
 }
 
 TEST(CNumbers, ScanDoubleLikePercentLf)

@@ -295,6 +295,90 @@ TEST_F(UniverseTest, RecordsAcrossTheReadWindowKeepTheirPairing)
     }
 }
 
+TEST_F(UniverseTest, ALineEndingAtTheWindowsLastByteIsReadWithinIt)
+{
+    // The reading window is filled whole when the file is at least as long as it: a last
+    // record whose data line ends in "-" and whose dropped 501st character, "0", is the last
+    // byte of the file then ends the window exactly, for files of every length around it.
+    const std::string data = "K1V" + std::string(496, ' ') + "-";
+    const std::string edge = std::string(500, 'N') + "\n" + data + "0";
+    for (size_t size = kCatalogueWindow + 990; size <= kCatalogueWindow + 1010; size++) {
+        // Padding records at 1 1 1, the first with a name long enough to make the size exact.
+        const size_t padding = size - edge.size();
+        const size_t records = (padding - 200) / 14;
+        const size_t first = padding - 14 * records - 13;
+        std::string text = std::string(first, 'F') + "\nG2V 1 1 1 1\n";
+        text.reserve(size);
+        for (size_t i = 0; i < records; i++)
+            text += "P\nG2V 1 1 1 1\n";
+        text += edge;
+        ASSERT_EQ(text.size(), size);
+
+        const TempCatalogue file(text);
+        const Universe u(file.PathString().c_str(), 1000000, 5000);
+        // The edge record's magnitude and position cannot be read: it keeps those of the
+        // record before it and joins its system.
+        ASSERT_EQ(u.CountItems(), 1) << size;
+        const StarSystem* s = u.SystemAt(0);
+        ASSERT_EQ(s->CountItems(), int32_t(records + 2));
+        EXPECT_EQ(std::string(s->StarAt(int32_t(records) + 1)->GetName()), std::string(79, 'N'));
+        EXPECT_EQ(s->StarAt(int32_t(records) + 1)->spectralClass.harvardClass, kClassK);
+    }
+}
+
+// The same catalogue with line feeds and with carriage return and line feed.
+std::string WithCrLf(const std::string& text)
+{
+    std::string out;
+    for (char c : text) {
+        if (c == '\n')
+            out += '\r';
+        out += c;
+    }
+    return out;
+}
+
+TEST_F(UniverseTest, CarriageReturnsBeforeLineFeedsAreLineEnds)
+{
+    const std::string text = "Sirius\nA1V 1.45 -0.49 2.48 -0.76\n"
+                             "Rigil Kentaurus\nG2V 4.38 -0.5 -0.41 -1.18\n"
+                             "Toliman\nK1V 5.71 -0.5 -0.41 -1.18\n"
+        + std::string(499, 'L') + "\nM5 11 1 1 1\n" + std::string(500, 'W')
+        + "\nK0 9 2 2 2\nLast\nG0 4 3 3 3";
+    const TempCatalogue lf(text), crlf(WithCrLf(text));
+    const Universe a(lf.PathString().c_str(), 1000000, 5000);
+    const Universe b(crlf.PathString().c_str(), 1000000, 5000);
+    ASSERT_EQ(a.CountItems(), 5);
+    ASSERT_EQ(b.CountItems(), a.CountItems());
+    EXPECT_STREQ(b.SystemAt(0)->GetName(), "Sirius");
+    EXPECT_STREQ(b.SystemAt(1)->StarAt(1)->GetName(), "Toliman");
+    EXPECT_STREQ(b.SystemAt(4)->GetName(), "Last");
+    for (int32_t i = 0; i < a.CountItems(); i++) {
+        const StarSystem* sa = a.SystemAt(i);
+        const StarSystem* sb = b.SystemAt(i);
+        EXPECT_STREQ(sb->GetName(), sa->GetName()) << i;
+        EXPECT_EQ(sb->position.x, sa->position.x) << i;
+        EXPECT_EQ(sb->position.y, sa->position.y) << i;
+        EXPECT_EQ(sb->position.z, sa->position.z) << i;
+        ASSERT_EQ(sb->CountItems(), sa->CountItems()) << i;
+        for (int32_t k = 0; k < sa->CountItems(); k++) {
+            EXPECT_STREQ(sb->StarAt(k)->GetName(), sa->StarAt(k)->GetName());
+            EXPECT_STREQ(
+                sb->StarAt(k)->GetSpectralClassString(), sa->StarAt(k)->GetSpectralClassString());
+            EXPECT_EQ(sb->StarAt(k)->GetMagnitude(), sa->StarAt(k)->GetMagnitude());
+        }
+    }
+}
+
+TEST_F(UniverseTest, ALoneCarriageReturnIsNoLineEnd)
+{
+    // Only CR LF is a line end: a carriage return inside a line stays part of it.
+    const TempCatalogue file("Odd\rName\r\nG2V 1 1 1 1\r\n");
+    const Universe u(file.PathString().c_str(), 1000000, 5000);
+    ASSERT_EQ(u.CountItems(), 1);
+    EXPECT_STREQ(u.SystemAt(0)->GetName(), "Odd\rName");
+}
+
 TEST(GeneratedUniverse, CountAndPositionsFollowTheGenerator)
 {
     // pi x 10^3 x 1 x 0.01 = 31.4: 31 systems.
