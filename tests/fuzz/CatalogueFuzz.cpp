@@ -1,0 +1,68 @@
+// Fuzzing the program's catalogue reader. The first byte of an input picks the size of the
+// reading window, so that records fall across its edges; the rest is the catalogue. Whatever the
+// window, the universe read is the one a window holding the whole input reads, and every name is
+// one line of at most 79 characters.
+#include "ImportRoundTrip.h"
+
+#include "catalog/Star.h"
+#include "catalog/Universe.h"
+
+#include <cstdio>
+#include <cstring>
+#include <memory>
+#include <string>
+
+namespace {
+
+using File = std::unique_ptr<std::FILE, int (*)(std::FILE*)>;
+
+void Read(std::string& text, size_t window, Universe* universe)
+{
+    File file(fmemopen(text.data(), text.size(), "rb"), &std::fclose);
+    FuzzCheck(file != nullptr, "cannot open the input as a file");
+    ReadCatalogue(file.get(), 1000000, universe, window);
+}
+
+// Doubles compared as the bits they are, so that NaN read twice counts as the same.
+bool Same(double a, double b)
+{
+    return std::memcmp(&a, &b, sizeof a) == 0;
+}
+
+} // namespace
+
+extern "C" int LLVMFuzzerTestOneInput(const uint8_t* data, size_t size)
+{
+    if (size < 2)
+        return 0;
+    const size_t window = 1 + size_t(data[0]) * 7;
+    std::string text(reinterpret_cast<const char*>(data) + 1, size - 1);
+
+    Universe small(5000), whole(5000);
+    Read(text, window, &small);
+    // A window that holds the whole input reads it as the program's megabyte window does.
+    Read(text, text.size() + 1, &whole);
+    FuzzCheck(small.CountItems() == whole.CountItems(), "the window changes the systems read");
+    for (int32_t s = 0; s < whole.CountItems(); s++) {
+        const StarSystem* a = small.SystemAt(s);
+        const StarSystem* b = whole.SystemAt(s);
+        FuzzCheck(std::strcmp(a->GetName(), b->GetName()) == 0, "the window changes a name");
+        FuzzCheck(Same(a->position.x, b->position.x) && Same(a->position.y, b->position.y)
+                && Same(a->position.z, b->position.z),
+            "the window changes a position");
+        FuzzCheck(a->CountItems() == b->CountItems(), "the window changes a system's stars");
+        for (int32_t k = 0; k < b->CountItems(); k++) {
+            const Star* p = a->StarAt(k);
+            const Star* q = b->StarAt(k);
+            FuzzCheck(std::strcmp(p->GetName(), q->GetName()) == 0, "the window changes a name");
+            FuzzCheck(std::strcmp(p->GetSpectralClassString(), q->GetSpectralClassString()) == 0,
+                "the window changes a spectral class");
+            FuzzCheck(Same(p->GetMagnitude(), q->GetMagnitude()), "the window changes a magnitude");
+            const size_t length = std::strlen(q->GetName());
+            FuzzCheck(length <= 79, "a name is longer than 79 characters");
+            FuzzCheck(
+                std::memchr(q->GetName(), '\n', length) == nullptr, "a name holds a line feed");
+        }
+    }
+    return 0;
+}
