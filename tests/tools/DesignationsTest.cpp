@@ -44,6 +44,26 @@ TEST(Designations, PositionDesignationRoundsWithoutReachingSixty)
     EXPECT_EQ(PositionDesignation(-0.0001, 0.0).substr(0, 5), "J2359");
 }
 
+TEST(Designations, PositionDesignationOfAnyValue)
+{
+    // Declinations past a pole, infinite ones too, stop at it; a right ascension that is not
+    // finite and a declination that is no number are taken as 0. None of them may overflow
+    // the integer conversions.
+    EXPECT_EQ(PositionDesignation(0.0, 1e20), "J000000.0+900000");
+    EXPECT_EQ(PositionDesignation(0.0, -1e20), "J000000.0-900000");
+    EXPECT_EQ(PositionDesignation(NAN, NAN), "J000000.0+000000");
+    EXPECT_EQ(PositionDesignation(INFINITY, -INFINITY), "J000000.0-900000");
+    EXPECT_EQ(PositionDesignation(1e300, 0.0).size(), 16u);
+}
+
+TEST(Designations, EveryNameSourceIsCleaned)
+{
+    EXPECT_EQ(ChooseName({ "", " \t", "Gl 559A" }, 0, 0), "Gl 559A");
+    EXPECT_EQ(ChooseName({ "HIP 12\x0b" + std::string(100, '3') }, 0, 0),
+        ("HIP 12 " + std::string(100, '3')).substr(0, 79));
+    EXPECT_EQ(ChooseName({ "", "\r\n" }, 0, 0), "J000000.0+000000");
+}
+
 TEST(Designations, CleanNamesFitTheCatalogue)
 {
     EXPECT_EQ(CleanName("  Rigel \t Kentaurus \r\n"), "Rigel Kentaurus");

@@ -1,11 +1,20 @@
 // Writing the program's catalogue: its text, and the file it replaces.
 #include "tools/importer/CatalogueWriter.h"
 
+#include "tools/importer/Designations.h"
+#include "tools/importer/StrictNumbers.h"
+
+#include <algorithm>
 #include <cerrno>
 #include <cstdio>
+#include <cstdlib>
 #include <cstring>
 #include <sys/stat.h>
 #include <unistd.h>
+
+// Where a star FormatCatalogue cannot write came from, for its errors; the star's line in
+// its source goes with it.
+static const char* const kUnwritable = "the stars to write";
 
 WriteSummary FormatCatalogue(
     std::FILE* out, const std::vector<ImportStar>& stars, const std::vector<StarGroup>& systems)
@@ -21,22 +30,40 @@ WriteSummary FormatCatalogue(
 
     std::fprintf(out, "The Sun\nG2V 4.83 0 0 0\n");
     count(1);
-    char previous[128] = "0.000000 0.000000 0.000000";
+    // The position the program read last, as it reads it back (as doubles, so "-0.000000" is
+    // the Sun's 0 0 0 too).
+    double previous[3] = { 0, 0, 0 };
     for (const StarGroup& system : systems) {
         const ImportStar& primary = stars[system.members.front()];
-        double x, y, z;
-        CartesianPosition(primary, &x, &y, &z);
+        double xyz[3], read[3];
+        CartesianPosition(primary, &xyz[0], &xyz[1], &xyz[2]);
+        for (double coordinate : xyz)
+            InRange(coordinate, -kMaxParsecs, kMaxParsecs, kUnwritable, primary.line, "position");
         char position[128];
-        std::snprintf(position, sizeof position, "%.6f %.6f %.6f", x, y, z);
-        // Two systems whose positions print alike would read back as one: move the second by
-        // the smallest step the file shows.
-        if (std::strcmp(position, previous) == 0)
-            std::snprintf(position, sizeof position, "%.6f %.6f %.6f", x + 1e-6, y, z);
-        std::strcpy(previous, position);
+        auto print = [&] {
+            std::snprintf(position, sizeof position, "%.6f %.6f %.6f", xyz[0], xyz[1], xyz[2]);
+            char* next = position;
+            for (double& coordinate : read)
+                coordinate = std::strtod(next, &next);
+        };
+        print();
+        // Two systems whose positions read back alike would be one: move the second by the
+        // smallest step the file shows.
+        while (std::equal(read, read + 3, previous)) {
+            xyz[0] += 1e-6;
+            print();
+        }
+        std::copy(read, read + 3, previous);
         for (size_t member : system.members) {
             const ImportStar& star = stars[member];
-            std::fprintf(out, "%s\n%s %.3f %s\n", star.name.c_str(), star.spectralClass.c_str(),
-                star.absoluteMagnitude, position);
+            // The readers hand over clean names and classes; cleaning again costs little and
+            // keeps every line one the program reads back as it was meant.
+            const std::string cleanClass = CleanSpectralClass(star.spectralClass);
+            std::fprintf(out, "%s\n%s %.3f %s\n", CleanName(star.name).c_str(),
+                cleanClass.empty() ? "?" : cleanClass.c_str(),
+                CheckedMagnitude(
+                    star.absoluteMagnitude, kUnwritable, star.line, "absolute magnitude"),
+                position);
         }
         count(system.members.size());
     }

@@ -16,7 +16,10 @@ struct WriteSummary {
 };
 
 // Writes the catalogue's text to out: "The Sun" first, then every system with its stars at the
-// position of its primary. Leaves checking out for errors to the caller.
+// position of its primary. Every record reads back to the same star: names and classes are
+// cleaned as the readers clean them, and a magnitude or position outside the ranges of
+// StrictNumbers.h throws ImportError (naming the star's line) rather than be written. Leaves
+// checking out for errors to the caller.
 WriteSummary FormatCatalogue(
     std::FILE* out, const std::vector<ImportStar>& stars, const std::vector<StarGroup>& systems);
 

@@ -107,6 +107,20 @@ public:
         return Number(*column, what);
     }
 
+    // The absolute magnitude: the absmag column's when the row has one, else one from the
+    // apparent mag and the distance in parsecs; either within the range the program holds.
+    double AbsoluteMagnitude(
+        std::optional<size_t> absmag, std::optional<size_t> mag, double parsecs) const
+    {
+        if (const auto m = OptionalNumber(absmag, "absmag"))
+            return CheckedMagnitude(*m, fFile, fLine, "absmag");
+        if (const auto v = OptionalNumber(mag, "mag"))
+            return CheckedMagnitude(
+                CheckedMagnitude(*v, fFile, fLine, "mag") + 5 - 5 * std::log10(parsecs), fFile,
+                fLine, "absolute magnitude");
+        throw ImportError(fFile, fLine, "no magnitude (both absmag and mag are empty)");
+    }
+
     int64_t Line() const { return fLine; }
 
 private:
@@ -124,16 +138,12 @@ private:
     int64_t fLine = 0;
 };
 
-// The spectral type as one word: blanks inside become nothing, an empty type is estimated
-// from the colour index when there is one.
+// The spectral type as the catalogue holds it; an empty type is estimated from the colour
+// index when there is one.
 std::string SpectralWord(
     const std::string& type, std::optional<double> colour, ImportReport& report)
 {
-    std::string word;
-    for (char c : type) {
-        if (!std::isspace(static_cast<unsigned char>(c)))
-            word += c;
-    }
+    const std::string word = CleanSpectralClass(type);
     if (!word.empty())
         return word;
     if (colour) {
@@ -193,43 +203,37 @@ void ReadHyg(
     while (table.Next()) {
         report.read++;
         const double distance = table.Number(dist, "dist");
-        const double raHours = table.Number(ra, "ra");
-        const double decDegrees = table.Number(dec, "dec");
+        const double raHours = InRange(table.Number(ra, "ra"), 0, 24, file, table.Line(), "ra");
+        const double decDegrees
+            = InRange(table.Number(dec, "dec"), -90, 90, file, table.Line(), "dec");
         if (Lower(table.Text(proper)) == "sol" || distance == 0) {
             report.Skip("the Sun (always written first)");
             continue;
         }
-        // HYG marks stars without a parallax with a distance of 100000 pc.
+        // HYG marks stars without a parallax, or with a dubious one, with a distance of
+        // 100000 pc or more.
         if (!(distance > 0) || distance >= 100000) {
             report.Skip("without a usable parallax");
             continue;
         }
+        CheckedParsecs(distance, file, table.Line(), "dist " + table.Text(dist) + " pc");
         ImportStar star;
         star.line = table.Line();
         star.ra = raHours / 24 * (kPI + kPI);
         star.dec = decDegrees / 180 * kPI;
         star.parallax = 1000.0 / distance;
-        if (const auto m = table.OptionalNumber(absmag, "absmag"))
-            star.absoluteMagnitude = *m;
-        else if (const auto v = table.OptionalNumber(mag, "mag"))
-            star.absoluteMagnitude = *v + 5 - 5 * std::log10(distance);
-        else
-            throw ImportError(file, table.Line(), "no magnitude (both absmag and mag are empty)");
+        star.absoluteMagnitude = table.AbsoluteMagnitude(absmag, mag, distance);
         star.spectralClass
             = SpectralWord(table.Text(spect), table.OptionalNumber(colour, "ci"), report);
 
-        std::string name = CleanName(table.Text(proper));
-        if (name.empty())
-            name = CleanName(ReadableDesignation(table.Text(bf)));
-        if (name.empty() && !table.Text(gl).empty())
-            name = CleanName(table.Text(gl));
-        if (name.empty() && !table.Text(hip).empty())
-            name = "HIP " + table.Text(hip);
-        if (name.empty() && !table.Text(hd).empty())
-            name = "HD " + table.Text(hd);
-        if (name.empty())
-            name = PositionDesignation(star.ra, star.dec);
-        star.name = name;
+        // Catalogue numbers are names only with their catalogue's prefix.
+        auto numbered = [&](const char* prefix, std::optional<size_t> column) {
+            const std::string number = CleanName(table.Text(column));
+            return number.empty() ? number : prefix + number;
+        };
+        star.name = ChooseName({ table.Text(proper), ReadableDesignation(table.Text(bf)),
+                                   table.Text(gl), numbered("HIP ", hip), numbered("HD ", hd) },
+            star.ra, star.dec);
         stars.push_back(std::move(star));
     }
 }
@@ -254,16 +258,21 @@ void ReadPlainCsv(
 
     while (table.Next()) {
         report.read++;
-        const double raDegrees = table.Number(ra, "ra");
-        const double decDegrees = table.Number(dec, "dec");
-        if (raDegrees < 0 || raDegrees >= 360 || decDegrees < -90 || decDegrees > 90)
-            throw ImportError(
-                file, table.Line(), "position out of range (ra 0..360, dec -90..90 degrees)");
+        const double raDegrees = InRange(table.Number(ra, "ra"), 0, 360, file, table.Line(), "ra");
+        const double decDegrees
+            = InRange(table.Number(dec, "dec"), -90, 90, file, table.Line(), "dec");
         double plx = 0;
-        if (const auto p = table.OptionalNumber(parallax, "parallax"))
+        if (const auto p = table.OptionalNumber(parallax, "parallax")) {
             plx = *p;
-        else if (const auto d = table.OptionalNumber(distance, "distance"))
-            plx = *d > 0 ? 1000.0 / *d : 0;
+            if (plx > 0)
+                CheckedParsecs(ParsecsFromParallax(plx), file, table.Line(),
+                    "parallax " + table.Text(parallax) + " mas");
+        } else if (const auto d = table.OptionalNumber(distance, "distance")) {
+            if (*d > 0)
+                plx = 1000.0
+                    / CheckedParsecs(
+                        *d, file, table.Line(), "distance " + table.Text(distance) + " pc");
+        }
         if (!(plx > 0)) {
             report.Skip("without a usable parallax");
             continue;
@@ -273,17 +282,10 @@ void ReadPlainCsv(
         star.ra = raDegrees / 180 * kPI;
         star.dec = decDegrees / 180 * kPI;
         star.parallax = plx;
-        if (const auto m = table.OptionalNumber(absmag, "absmag"))
-            star.absoluteMagnitude = *m;
-        else if (const auto v = table.OptionalNumber(mag, "mag"))
-            star.absoluteMagnitude = *v + 5 + 5 * std::log10(plx / 1000);
-        else
-            throw ImportError(file, table.Line(), "no magnitude");
+        star.absoluteMagnitude = table.AbsoluteMagnitude(absmag, mag, ParsecsFromParallax(plx));
         star.spectralClass
             = SpectralWord(table.Text(spect), table.OptionalNumber(colour, "bv"), report);
-        star.name = CleanName(table.Text(name));
-        if (star.name.empty())
-            star.name = PositionDesignation(star.ra, star.dec);
+        star.name = ChooseName({ table.Text(name) }, star.ra, star.dec);
         stars.push_back(std::move(star));
     }
 }

@@ -3,6 +3,7 @@
 
 #include "core/Constants.h"
 
+#include <algorithm>
 #include <cctype>
 #include <cmath>
 #include <cstdio>
@@ -219,6 +220,11 @@ std::string ReadableDesignation(const std::string& designation)
 std::string PositionDesignation(double ra, double dec)
 {
     constexpr double kTurn = kPI + kPI;
+    // The readers check their ranges; this keeps the conversions to integers below defined
+    // for any value, a declination past a pole or a right ascension that is no number.
+    if (!std::isfinite(ra))
+        ra = 0;
+    dec = std::isnan(dec) ? 0 : std::clamp(dec, -kPI / 2, kPI / 2);
     double hours = std::fmod(ra, kTurn) / kTurn * 24.0;
     if (hours < 0)
         hours += 24.0;
@@ -257,6 +263,28 @@ std::string CleanName(const std::string& name)
         out.resize(cut);
         while (!out.empty() && out.back() == ' ')
             out.pop_back();
+    }
+    return out;
+}
+
+std::string ChooseName(std::initializer_list<std::string> candidates, double ra, double dec)
+{
+    for (const std::string& candidate : candidates) {
+        std::string name = CleanName(candidate);
+        if (!name.empty())
+            return name;
+    }
+    return CleanName(PositionDesignation(ra, dec));
+}
+
+std::string CleanSpectralClass(const std::string& type)
+{
+    // The program keeps 7 characters of a class (and reads it as one blank-free word).
+    constexpr size_t kMaxClass = 7;
+    std::string out;
+    for (char c : type) {
+        if (c > ' ' && c < 127 && out.size() < kMaxClass)
+            out += c;
     }
     return out;
 }

@@ -1,7 +1,8 @@
 // Star names the program can show: readable Bayer and Flamsteed designations, designations
-// built from a position, and the clean-up every written name goes through.
+// built from a position, and the clean-up every written name and spectral class goes through.
 #pragma once
 
+#include <initializer_list>
 #include <string>
 
 // "alp CMa" -> "Alpha Canis Majoris", "alp1Cen" and "Alp2Cen" -> "Alpha1 Centauri" and
@@ -21,3 +22,12 @@ std::string PositionDesignation(double ra, double dec);
 // A name as the catalogue file can hold it: control characters become blanks, runs of blanks
 // one blank, no blanks at either end, at most 79 bytes (never cutting a UTF-8 character).
 std::string CleanName(const std::string& name);
+
+// The first of the candidates that is not empty once cleaned, else the position designation;
+// ra and dec in radians.
+std::string ChooseName(std::initializer_list<std::string> candidates, double ra, double dec);
+
+// A spectral type as the catalogue file can hold it: one word of at most 7 characters, the
+// program's limit. Blanks and everything but printable ASCII are left out ("K2 III" ->
+// "K2III"), the rest is cut to its first 7 characters; empty when nothing is left.
+std::string CleanSpectralClass(const std::string& type);

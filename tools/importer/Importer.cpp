@@ -162,8 +162,13 @@ What is written:
   parallax in parsecs. Absolute magnitude M = V + 5 + 5 log10(parallax in arcseconds).
   Names: the common name, else the Bayer or Flamsteed designation written out ("Alpha
   Centauri", "61 Cygni"), else one built from the position ("J210654.0+384458"); at most
-  79 characters. A missing spectral type is estimated from B-V when there is one, else "?".
-  Stars without a positive parallax are skipped and counted.
+  79 characters, control characters made blanks. The spectral type is written as one word
+  of at most 7 characters: blanks and characters other than printable ASCII are left out
+  and the rest is cut to 7 ("K2 III" is "K2III"). A missing spectral type is estimated from
+  B-V when there is one, else "?". Stars without a positive parallax are skipped and counted.
+  Out of range is bad input: declination beyond +-90 degrees, right ascension outside
+  0-24 h (kstars, hyg) or 0-360 degrees (csv), a parallax or distance placing a star beyond
+  1,000,000 pc or nearer than 1 AU, a magnitude (apparent or absolute) outside -30..40.
 
 Star systems:
   Two stars are one system when they are at most 5,000 AU apart across the line of sight

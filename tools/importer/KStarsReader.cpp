@@ -30,6 +30,15 @@ std::string Field(const std::string& line, const Columns& c)
     return line.substr(c.begin, c.end - c.begin);
 }
 
+std::string Trimmed(std::string s)
+{
+    while (!s.empty() && s.back() == ' ')
+        s.pop_back();
+    while (!s.empty() && s.front() == ' ')
+        s.erase(0, 1);
+    return s;
+}
+
 } // namespace
 
 void ReadKStars(
@@ -52,12 +61,9 @@ void ReadKStars(
 
         // A field's number, checked against its range. Sixty seconds occur in the catalogue
         // (rounded 59.995) and mean the next minute; they are read as they stand.
-        auto number_at = [&](const Columns& c, double low = -1e9, double high = 1e9) {
-            const double value = StrictNumber(Field(line, c), file, number, c.what);
-            if (value < low || value > high)
-                throw ImportError(
-                    file, number, std::string(c.what) + " " + Field(line, c) + " out of range");
-            return value;
+        auto number_at = [&](const Columns& c, double low = -HUGE_VAL, double high = HUGE_VAL) {
+            return InRange(StrictNumber(Field(line, c), file, number, c.what), low, high, file,
+                number, c.what);
         };
         const double raH = number_at(kRaHours, 0, 23), raM = number_at(kRaMinutes, 0, 59),
                      raS = number_at(kRaSeconds, 0, 60);
@@ -66,26 +72,30 @@ void ReadKStars(
             throw ImportError(file, number, "declination sign is '" + sign + "', not + or -");
         const double decD = number_at(kDecDegrees, 0, 90), decM = number_at(kDecMinutes, 0, 59),
                      decS = number_at(kDecSeconds, 0, 60);
+        const double decDegrees = decD + decM / 60 + decS / 3600;
+        if (decDegrees > 90)
+            throw ImportError(file, number,
+                "declination " + sign + Field(line, kDecDegrees) + " " + Field(line, kDecMinutes)
+                    + " " + Field(line, kDecSeconds) + " lies beyond the pole");
         const double parallax = number_at(kParallax);
-        const double magnitude = number_at(kMagnitude);
+        const double magnitude = number_at(kMagnitude, kMinMagnitude, kMaxMagnitude);
 
         if (!(parallax > 0)) {
             report.Skip("without a usable parallax");
             continue;
         }
+        CheckedParsecs(ParsecsFromParallax(parallax), file, number,
+            "parallax " + Trimmed(Field(line, kParallax)) + " mas");
 
         ImportStar star;
         star.line = number;
         star.ra = (raH + raM / 60 + raS / 3600) / 24 * (kPI + kPI);
-        star.dec = (sign == "-" ? -1 : 1) * (decD + decM / 60 + decS / 3600) / 180 * kPI;
+        star.dec = (sign == "-" ? -1 : 1) * decDegrees / 180 * kPI;
         star.parallax = parallax;
-        star.absoluteMagnitude = magnitude + 5 + 5 * std::log10(parallax / 1000);
+        star.absoluteMagnitude = CheckedMagnitude(
+            magnitude + 5 + 5 * std::log10(parallax / 1000), file, number, "absolute magnitude");
 
-        std::string type = Field(line, kSpectralType);
-        while (!type.empty() && type.back() == ' ')
-            type.pop_back();
-        while (!type.empty() && type.front() == ' ')
-            type.erase(0, 1);
+        std::string type = CleanSpectralClass(Field(line, kSpectralType));
         if (type.empty()) {
             const std::string colour = Field(line, kColour);
             double bv = 0;
@@ -108,14 +118,8 @@ void ReadKStars(
             if (second != std::string::npos)
                 common = rest.substr(second + 1);
         }
-        std::string name = CleanName(common);
-        if (name.empty())
-            name = CleanName(ReadableDesignation(designation));
-        if (name.empty())
-            name = CleanName(designation);
-        if (name.empty())
-            name = PositionDesignation(star.ra, star.dec);
-        star.name = name;
+        star.name = ChooseName(
+            { common, ReadableDesignation(designation), designation }, star.ra, star.dec);
         stars.push_back(std::move(star));
     }
     if (in.bad())

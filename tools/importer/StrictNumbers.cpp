@@ -1,10 +1,23 @@
-// Whole-field number parsing for the importer.
+// Whole-field number parsing and the ranges of a star's values.
 #include "tools/importer/StrictNumbers.h"
 
 #include "tools/importer/ImportStar.h"
 
 #include <charconv>
 #include <cmath>
+#include <cstdio>
+
+namespace {
+
+// A value for a message: short, and exactly what was read when it was a plain figure.
+std::string Shown(double value)
+{
+    char text[32];
+    std::snprintf(text, sizeof text, "%.6g", value);
+    return text;
+}
+
+} // namespace
 
 bool ParseNumber(const std::string& text, double* value)
 {
@@ -13,8 +26,13 @@ bool ParseNumber(const std::string& text, double* value)
         begin++;
     while (end > begin && (text[end - 1] == ' ' || text[end - 1] == '\t'))
         end--;
-    if (begin < end && text[begin] == '+')
+    // from_chars takes a minus but no plus; a plus is stepped over here, and must not be
+    // followed by a second sign ("+-5").
+    if (begin < end && text[begin] == '+') {
         begin++;
+        if (begin < end && (text[begin] == '-' || text[begin] == '+'))
+            return false;
+    }
     if (begin == end)
         return false;
     double result = 0;
@@ -32,4 +50,29 @@ double StrictNumber(
     if (!ParseNumber(text, &value))
         throw ImportError(file, line, "bad number in " + what + ": '" + text + "'");
     return value;
+}
+
+double InRange(double value, double low, double high, const std::string& file, int64_t line,
+    const std::string& what)
+{
+    if (!(value >= low && value <= high))
+        throw ImportError(file, line,
+            what + " " + Shown(value) + " out of range " + Shown(low) + ".." + Shown(high));
+    return value;
+}
+
+double CheckedMagnitude(
+    double magnitude, const std::string& file, int64_t line, const std::string& what)
+{
+    return InRange(magnitude, kMinMagnitude, kMaxMagnitude, file, line, what);
+}
+
+double CheckedParsecs(
+    double parsecs, const std::string& file, int64_t line, const std::string& shown)
+{
+    if (!(parsecs <= kMaxParsecs))
+        throw ImportError(file, line, shown + " places the star beyond 1,000,000 pc");
+    if (!(parsecs >= kMinParsecs))
+        throw ImportError(file, line, shown + " places the star nearer than 1 AU");
+    return parsecs;
 }
