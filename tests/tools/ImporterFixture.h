@@ -43,7 +43,14 @@ protected:
     // Runs the command; returns its exit status and puts what it printed into output.
     int Run(const std::string& arguments, std::string* output) const
     {
-        const std::string command = std::string(ND_IMPORTER) + " " + arguments + " 2>&1";
+        return RunShell(std::string(ND_IMPORTER) + " " + arguments, output);
+    }
+
+    // Runs a shell command line (for pipes, redirections and limits around the command);
+    // returns its exit status and puts what it printed into output.
+    static int RunShell(const std::string& commandLine, std::string* output)
+    {
+        const std::string command = "{ " + commandLine + "; } 2>&1";
         std::unique_ptr<FILE, int (*)(FILE*)> pipe(popen(command.c_str(), "r"), pclose);
         std::array<char, 4096> buffer;
         output->clear();

@@ -13,6 +13,7 @@ struct WriteSummary {
     int64_t systems = 0; // the Sun included
     int64_t stars = 0; // the Sun included
     std::vector<int64_t> systemsBySize; // [n] = systems of n stars
+    int64_t leftoversRemoved = 0; // temporary files of killed imports found beside it
 };
 
 // Writes the catalogue's text to out: "The Sun" first, then every system with its stars at the
@@ -23,8 +24,16 @@ struct WriteSummary {
 WriteSummary FormatCatalogue(
     std::FILE* out, const std::vector<ImportStar>& stars, const std::vector<StarGroup>& systems);
 
-// Writes the catalogue to path. The text goes to a temporary file beside path that replaces
-// path only when all is written, so a failed run never leaves a partial catalogue. Throws
-// ImportError when it cannot write.
+// The file a catalogue written to path replaces: path itself, or the file its symbolic links
+// lead to (which need not exist yet). Throws ImportError when that is anything but a regular
+// file: a directory, a device, a named pipe.
+std::string CatalogueTarget(const std::string& path);
+
+// Writes the catalogue to path, or through its symbolic links to the file they lead to. The
+// text goes to a locked temporary file "<file>.importing-XXXXXX" beside that file, which
+// replaces it only when all is written and takes over its permissions (0644 for a new file), so
+// a failed run never leaves a partial catalogue. SIGINT, SIGTERM and SIGHUP remove the
+// temporary file before the process dies of them; the unlocked leftovers of killed imports
+// beside the file are removed first. Throws ImportError when it cannot write.
 WriteSummary WriteCatalogue(const std::string& path, const std::vector<ImportStar>& stars,
     const std::vector<StarGroup>& systems);

@@ -5,9 +5,13 @@
 
 #include <algorithm>
 #include <cctype>
+#include <cerrno>
 #include <cstring>
 #include <fstream>
+#include <new>
 #include <sstream>
+#include <streambuf>
+#include <sys/stat.h>
 
 namespace {
 
@@ -57,49 +61,130 @@ InputFormat GuessFormat(const std::string& firstLine)
     return InputFormat::Guess;
 }
 
-ImportResult RunImport(const ImportOptions& options)
+namespace {
+
+// The input after its first line has been read to tell the format: that line again, then the
+// rest of the stream. A pipe cannot seek back to its start, so the readers get this instead.
+class ReplayingBuffer : public std::streambuf {
+public:
+    ReplayingBuffer(std::string head, std::streambuf* rest)
+        : fHead(std::move(head))
+        , fRest(rest)
+    {
+        setg(fHead.data(), fHead.data(), fHead.data() + fHead.size());
+    }
+
+protected:
+    int_type underflow() override
+    {
+        if (gptr() < egptr())
+            return traits_type::to_int_type(*gptr());
+        const std::streamsize got = fRest->sgetn(fBuffer, sizeof fBuffer);
+        if (got <= 0)
+            return traits_type::eof();
+        setg(fBuffer, fBuffer, fBuffer + got);
+        return traits_type::to_int_type(*gptr());
+    }
+
+private:
+    std::string fHead;
+    std::streambuf* fRest; // not owned
+    char fBuffer[1 << 16];
+};
+
+// Reads the stars of options.input, refusing a file that is no catalogue at all.
+void ReadInput(const ImportOptions& options, std::vector<ImportStar>& stars, ImportReport& report)
 {
-    ImportResult result;
+    const std::string& file = options.input;
+    struct stat st;
+    if (stat(file.c_str(), &st) == 0 && S_ISDIR(st.st_mode))
+        throw ImportError(file, 0, "is a directory, not a catalogue");
+    std::ifstream in(file, std::ios::binary);
+    if (!in)
+        throw ImportError(file, 0, std::string("cannot open: ") + std::strerror(errno));
+    std::string first;
+    if (!std::getline(in, first) || (first.empty() && in.peek() == EOF))
+        throw ImportError(file, 0, "the file is empty");
+    InputFormat format = options.format;
+    if (format == InputFormat::Guess)
+        format = GuessFormat(first);
+    if (format == InputFormat::Guess)
+        throw ImportError(
+            file, 1, "cannot tell the format from the first line; name it with --format");
+    report.format = FormatName(format);
+
+    if (!in.eof())
+        first += '\n';
+    ReplayingBuffer replay(std::move(first), in.rdbuf());
+    std::istream whole(&replay);
+    switch (format) {
+    case InputFormat::KStars:
+        ReadKStars(whole, file, stars, report);
+        break;
+    case InputFormat::Hyg:
+        ReadHyg(whole, file, stars, report);
+        break;
+    case InputFormat::Csv:
+        ReadPlainCsv(whole, file, stars, report);
+        break;
+    case InputFormat::Guess:
+        break;
+    }
+    if (report.read == 0)
+        throw ImportError(file, 0, "no stars in the file");
+    if (stars.empty()) {
+        std::string reasons;
+        for (const auto& [reason, count] : report.skipped)
+            reasons += (reasons.empty() ? "" : ", ") + Thousands(count) + " " + reason;
+        throw ImportError(file, 0,
+            "no star to write: all " + Thousands(report.read) + " stars read were skipped ("
+                + reasons + ")");
+    }
+}
+
+// Refuses to import a catalogue onto itself, however the two names reach it.
+void CheckInputIsNotOutput(const ImportOptions& options)
+{
+    struct stat input, output;
+    if (options.generate < 0 && stat(options.input.c_str(), &input) == 0
+        && stat(CatalogueTarget(options.output).c_str(), &output) == 0
+        && input.st_dev == output.st_dev && input.st_ino == output.st_ino)
+        throw ImportError(options.input, 0,
+            "is the output " + options.output + " too; write the catalogue to another file");
+}
+
+void Import(const ImportOptions& options, ImportResult& result)
+{
     std::vector<ImportStar> stars;
     if (options.generate >= 0) {
-        result.report.source = "synthetic catalogue, seed " + std::to_string(options.seed);
         result.report.format = "generated";
         GenerateStars(options.generate, options.seed, stars, result.report);
     } else {
-        const std::string& file = options.input;
-        std::ifstream in(file, std::ios::binary);
-        if (!in)
-            throw ImportError(file, 0, std::string("cannot open: ") + std::strerror(errno));
-        std::string first;
-        if (!std::getline(in, first) || (first.empty() && in.peek() == EOF))
-            throw ImportError(file, 0, "the file is empty");
-        in.clear();
-        in.seekg(0);
-        InputFormat format = options.format;
-        if (format == InputFormat::Guess)
-            format = GuessFormat(first);
-        if (format == InputFormat::Guess)
-            throw ImportError(
-                file, 1, "cannot tell the format from the first line; name it with --format");
-        result.report.source = file;
-        result.report.format = FormatName(format);
-        switch (format) {
-        case InputFormat::KStars:
-            ReadKStars(in, file, stars, result.report);
-            break;
-        case InputFormat::Hyg:
-            ReadHyg(in, file, stars, result.report);
-            break;
-        case InputFormat::Csv:
-            ReadPlainCsv(in, file, stars, result.report);
-            break;
-        case InputFormat::Guess:
-            break;
-        }
-        if (result.report.read == 0)
-            throw ImportError(file, 0, "no stars in the file");
+        ReadInput(options, stars, result.report);
     }
     result.summary = WriteCatalogue(options.output, stars, GroupSystems(stars));
+}
+
+} // namespace
+
+ImportResult RunImport(const ImportOptions& options)
+{
+    // Before anything is read: a catalogue the output cannot replace is refused at once.
+    CatalogueTarget(options.output);
+    CheckInputIsNotOutput(options);
+
+    ImportResult result;
+    result.report.source = options.generate >= 0
+        ? "synthetic catalogue, seed " + std::to_string(options.seed)
+        : options.input;
+    try {
+        Import(options, result);
+    } catch (const std::bad_alloc&) {
+        // The stars are freed by now, so the message has memory to be made in.
+        const int64_t wanted = options.generate >= 0 ? options.generate : result.report.read;
+        throw ImportError(
+            result.report.source, 0, "not enough memory for " + Thousands(wanted) + " stars");
+    }
     return result;
 }
 
@@ -122,6 +207,10 @@ std::string DescribeImport(const ImportResult& result)
             out << "  " << Thousands(s.systemsBySize[size]) << " of " << size
                 << (size == 1 ? " star\n" : " stars\n");
     }
+    if (s.leftoversRemoved > 0)
+        out << "Removed " << Thousands(s.leftoversRemoved)
+            << (s.leftoversRemoved == 1 ? " temporary file" : " temporary files")
+            << " left beside the catalogue by killed imports.\n";
     return out.str();
 }
 
@@ -135,9 +224,17 @@ Writes a star catalogue for Nightdome ("stars.dat": two lines a star, the name, 
 
 Options:
   -o, --output=FILE   the catalogue to write (default: stars.dat). It is written to a
-                      temporary file beside it and replaces it only when all went well.
-  --format=FORMAT     kstars, hyg or csv; without it the first line decides.
-  --generate=COUNT    write a synthetic catalogue of COUNT stars instead (for benchmarks).
+                      temporary file FILE.importing-XXXXXX beside it and replaces it only
+                      when all went well, keeping its permissions (a new file gets
+                      rw-r--r--). A symbolic link is followed: the file it leads to is
+                      replaced. A directory, device or named pipe is refused, and so is the
+                      input catalogue itself, which an import must not overwrite.
+                      Ctrl-C, SIGTERM and SIGHUP remove the temporary file; the one a
+                      killed import leaves is removed by the next import into the folder.
+  --format=FORMAT     kstars, hyg or csv; without it the first line decides. INPUT may be
+                      a pipe, such as /dev/stdin.
+  --generate=COUNT    write a synthetic catalogue of COUNT stars instead (for benchmarks),
+                      from 1 to 100,000,000: more would not fit in a desktop's memory.
   --seed=N            seed of the synthetic catalogue (default 1); the same seed gives the
                       same catalogue.
   -q, --quiet         print nothing but errors.
@@ -166,6 +263,7 @@ What is written:
   of at most 7 characters: blanks and characters other than printable ASCII are left out
   and the rest is cut to 7 ("K2 III" is "K2III"). A missing spectral type is estimated from
   B-V when there is one, else "?". Stars without a positive parallax are skipped and counted.
+  An input with no star left to write is an error that says why its stars were skipped.
   Out of range is bad input: declination beyond +-90 degrees, right ascension outside
   0-24 h (kstars, hyg) or 0-360 degrees (csv), a parallax or distance placing a star beyond
   1,000,000 pc or nearer than 1 AU, a magnitude (apparent or absolute) outside -30..40.

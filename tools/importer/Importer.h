@@ -22,7 +22,9 @@ struct ImportResult {
     WriteSummary summary;
 };
 
-// Throws ImportError for bad input or output; the output file is then as it was.
+// Throws ImportError for bad input or output, for an input that is the output itself, for an
+// input with no star left to write and for too little memory; the output file is then as it
+// was.
 ImportResult RunImport(const ImportOptions& options);
 
 // The format of a catalogue from its first line: '#' comments or fixed columns mean kstars, a

@@ -1,12 +1,19 @@
 // nightdome-import: writes the program's star catalogue from a published one.
 #include "tools/importer/Importer.h"
 
+#include <charconv>
+#include <cstdint>
 #include <cstdio>
 #include <cstring>
 #include <iostream>
+#include <new>
 #include <string>
 
 namespace {
+
+// The most stars --generate makes. An import needs some 270 bytes a star at its peak, so this
+// is about 27 GB: past what a benchmark needs and about what a large desktop has.
+constexpr int64_t kMaxGenerated = 100000000;
 
 bool Value(const std::string& arg, const char* option, std::string* value)
 {
@@ -16,6 +23,15 @@ bool Value(const std::string& arg, const char* option, std::string* value)
         return true;
     }
     return false;
+}
+
+// A whole number of decimal digits only, all of text, within the range of T.
+template <typename T> bool WholeNumber(const std::string& text, T* value)
+{
+    if (text.empty() || text.find_first_not_of("0123456789") != std::string::npos)
+        return false;
+    const auto [end, error] = std::from_chars(text.data(), text.data() + text.size(), *value);
+    return error == std::errc() && end == text.data() + text.size();
 }
 
 int Usage(const std::string& problem)
@@ -54,19 +70,14 @@ int main(int argc, char** argv)
             else
                 return Usage("unknown format '" + value + "' (kstars, hyg or csv)");
         } else if (Value(arg, "--generate", &value)) {
-            try {
-                options.generate = std::stoll(value);
-            } catch (...) {
-                options.generate = -1;
-            }
-            if (options.generate < 0)
-                return Usage("--generate needs a star count, not '" + value + "'");
+            if (!WholeNumber(value, &options.generate) || options.generate < 1
+                || options.generate > kMaxGenerated)
+                return Usage(
+                    "--generate needs a star count from 1 to 100,000,000, not '" + value + "'");
         } else if (Value(arg, "--seed", &value)) {
-            try {
-                options.seed = std::stoull(value);
-            } catch (...) {
-                return Usage("--seed needs a whole number, not '" + value + "'");
-            }
+            if (!WholeNumber(value, &options.seed))
+                return Usage("--seed needs a whole number from 0 to " + std::to_string(UINT64_MAX)
+                    + ", not '" + value + "'");
         } else if (!arg.empty() && arg[0] == '-') {
             return Usage("unknown option " + arg);
         } else if (options.input.empty()) {
@@ -85,8 +96,11 @@ int main(int argc, char** argv)
                       << "\n";
     } catch (const ImportError& error) {
         std::cerr << "nightdome-import: " << error.what() << "\n";
-        if (options.generate < 0)
-            std::cerr << "nightdome-import: " << options.output << " was not changed.\n";
+        std::cerr << "nightdome-import: " << options.output << " was not changed.\n";
+        return 1;
+    } catch (const std::bad_alloc&) {
+        // Outside the import, which reports its own shortage with the star count.
+        std::cerr << "nightdome-import: not enough memory\n";
         return 1;
     }
     return 0;
