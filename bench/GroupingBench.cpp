@@ -1,6 +1,7 @@
 // The importer's grouping of stars into systems over three million stars, on one core: a sky
 // like the real one, the same with one star far nearer than any real one, and a sky crowded
 // with near stars.
+#include "core/Constants.h"
 #include "tools/importer/SystemGrouping.h"
 
 #include <benchmark/benchmark.h>
@@ -13,7 +14,6 @@
 namespace {
 
 constexpr size_t kStars = 3000000;
-constexpr double kPi = 3.141592653589793;
 // The widest angle (radians) the grouping allows a pair at one parsec.
 constexpr double kAngleAtOneParsec = kMaxSeparationAU / 206264.806;
 
@@ -47,7 +47,7 @@ std::vector<ImportStar> Catalogue(Spread spread, bool withNearest)
     while (stars.size() < kStars) {
         const double parallax
             = spread == Spread::EvenInSpace ? 1000 / std::cbrt(uniform(8, 1e9)) : uniform(1, 500);
-        const double ra = uniform(0, 2 * kPi), dec = std::asin(uniform(-1, 1));
+        const double ra = uniform(0, 2 * kPI), dec = std::asin(uniform(-1, 1));
         add(ra, dec, parallax);
         if (random() % 8 == 0) {
             // Straight north or south, within the limit at this distance.
