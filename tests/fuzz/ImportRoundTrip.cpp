@@ -102,6 +102,9 @@ void CheckImportRoundTrip(const uint8_t* data, size_t size, InputFormat format)
         case InputFormat::Hyg:
             ReadHyg(in, "fuzz", stars, report);
             break;
+        case InputFormat::SouthernStars:
+            ReadSouthernStars(in, "fuzz", stars, report);
+            break;
         case InputFormat::Csv:
         case InputFormat::Guess:
             ReadPlainCsv(in, "fuzz", stars, report);

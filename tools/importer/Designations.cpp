@@ -9,6 +9,7 @@
 #include <cstdio>
 #include <cstring>
 #include <utility>
+#include <vector>
 
 namespace {
 
@@ -277,6 +278,20 @@ std::string ChooseName(std::initializer_list<std::string> candidates, double ra,
     return CleanName(PositionDesignation(ra, dec));
 }
 
+void NameStar(ImportStar& star, std::initializer_list<NameCandidate> candidates)
+{
+    for (const NameCandidate& candidate : candidates) {
+        std::string name = CleanName(candidate.text);
+        if (!name.empty()) {
+            star.name = std::move(name);
+            star.nameKind = candidate.kind;
+            return;
+        }
+    }
+    star.name = CleanName(PositionDesignation(star.ra, star.dec));
+    star.nameKind = NameKind::Position;
+}
+
 std::string CleanSpectralClass(const std::string& type)
 {
     // The program keeps 7 characters of a class (and reads it as one blank-free word).
@@ -287,4 +302,50 @@ std::string CleanSpectralClass(const std::string& type)
             out += c;
     }
     return out;
+}
+
+std::string WrittenOutDesignation(const std::string& id)
+{
+    std::vector<std::string> words;
+    for (size_t i = 0; i < id.size();) {
+        const size_t end = std::min(id.find(' ', i), id.size());
+        if (end > i)
+            words.push_back(id.substr(i, end - i));
+        i = end + 1;
+    }
+    if (words.size() < 2 || words.size() > 3)
+        return {};
+    const std::string genitive = ConstellationGenitive(words[1]);
+    if (genitive.empty())
+        return {};
+    // A component letter after the constellation: "A", "B", "Aa", "Bb".
+    std::string component;
+    if (words.size() == 3) {
+        const std::string& c = words[2];
+        if (c.size() > 2 || !std::isupper(static_cast<unsigned char>(c[0]))
+            || (c.size() == 2 && !std::islower(static_cast<unsigned char>(c[1]))))
+            return {};
+        component = " " + c;
+    }
+
+    const std::string& first = words[0];
+    if (std::all_of(first.begin(), first.end(), IsDigit))
+        return first + " " + genitive + component; // Flamsteed
+    // Bayer's Latin letters: lower case, or the capitals A to Q (from R on, capitals name
+    // variable stars).
+    if (first.size() == 1
+        && (std::islower(static_cast<unsigned char>(first[0]))
+            || (first[0] >= 'A' && first[0] <= 'Q')))
+        return first + " " + genitive + component;
+    size_t letters = 0;
+    while (letters < first.size() && IsAlpha(first[letters]))
+        letters++;
+    const std::string number = first.substr(letters);
+    if (!std::all_of(number.begin(), number.end(), IsDigit))
+        return {};
+    for (const auto& greek : kGreek) {
+        if (EqualsIgnoringCase(first.substr(0, letters), greek.second))
+            return greek.second + number + " " + genitive + component;
+    }
+    return {};
 }

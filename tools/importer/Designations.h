@@ -2,6 +2,8 @@
 // built from a position, and the clean-up every written name and spectral class goes through.
 #pragma once
 
+#include "tools/importer/ImportStar.h"
+
 #include <initializer_list>
 #include <string>
 
@@ -10,6 +12,11 @@
 // Canis Majoris" (the Greek letter is preferred to the Flamsteed number). Empty when the text
 // is no designation of this kind.
 std::string ReadableDesignation(const std::string& designation);
+
+// A Bayer or Flamsteed designation as other catalogues spell it, written out: "alpha1 Cen" ->
+// "Alpha1 Centauri", "61 Cyg" -> "61 Cygni", "p Eri" -> "p Eridani", "xi UMa Bb" -> "Xi Ursae
+// Majoris Bb". Empty for anything else, such as variable-star names ("V645 Cen", "BL Cet").
+std::string WrittenOutDesignation(const std::string& id);
 
 // The genitive of a constellation's three-letter abbreviation ("Cyg" -> "Cygni"); empty when
 // unknown. Case matters only where it tells two constellations apart.
@@ -31,3 +38,13 @@ std::string ChooseName(std::initializer_list<std::string> candidates, double ra,
 // program's limit. Blanks and everything but printable ASCII are left out ("K2 III" ->
 // "K2III"), the rest is cut to its first 7 characters; empty when nothing is left.
 std::string CleanSpectralClass(const std::string& type);
+
+// A name a catalogue offers for a star, and what kind of name it is.
+struct NameCandidate {
+    std::string text;
+    NameKind kind;
+};
+
+// Gives the star the first candidate that is not empty once cleaned, with its kind, else the
+// position designation (star.ra and star.dec must be set).
+void NameStar(ImportStar& star, std::initializer_list<NameCandidate> candidates);

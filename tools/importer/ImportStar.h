@@ -7,6 +7,16 @@
 #include <stdexcept>
 #include <string>
 
+// Where a star's name came from, best first, for the import's report.
+enum class NameKind {
+    Proper, // a common name: "Sirius", "Barnard's Star"
+    Designation, // Bayer or Flamsteed, written out: "Alpha Centauri", "61 Cygni"
+    Gliese, // "GJ 1061"
+    HenryDraper, // "HD 48915"
+    Other, // a name the input gave without saying what it is, or another catalogue's number
+    Position, // built from the position: "J210654.0+384458"
+};
+
 struct ImportStar {
     std::string name; // as written: at most 79 characters, no line feeds
     double ra = 0; // right ascension, radians
@@ -18,6 +28,11 @@ struct ImportStar {
     // Stars with the same group number of 0 or more are one system as they stand; -1 leaves
     // the grouping to the sky-and-parallax rule.
     int64_t group = -1;
+    NameKind nameKind = NameKind::Other;
+    // The absolute magnitude is measured (from an apparent magnitude and the distance), not
+    // estimated from the spectral type; only measured stars are matched across catalogues.
+    bool measured = true;
+    bool classEstimated = false; // the spectral class is not published but estimated
 };
 
 // What the importer did with its input: stars read, and the ones left out, by reason.
@@ -27,6 +42,9 @@ struct ImportReport {
     int64_t read = 0;
     std::map<std::string, int64_t> skipped; // reason -> count
     int64_t classesFromColour = 0; // spectral class estimated from the B-V colour index
+    int64_t classesFromMagnitude = 0; // estimated from the absolute magnitude
+    int64_t magnitudesFromClass = 0; // absolute magnitude estimated from the spectral type
+    int64_t classesAssumed = 0; // neither type, colour nor magnitude: a typical red dwarf
 
     int64_t Skipped() const;
     void Skip(const std::string& reason) { skipped[reason]++; }

@@ -35,6 +35,8 @@ const char* FormatName(InputFormat format)
         return "HYG";
     case InputFormat::Csv:
         return "plain CSV";
+    case InputFormat::SouthernStars:
+        return "Southern Stars CSV";
     case InputFormat::Guess:
         break;
     }
@@ -53,6 +55,17 @@ InputFormat GuessFormat(const std::string& firstLine)
     std::string lower = firstLine;
     for (char& c : lower)
         c = static_cast<char>(std::tolower(static_cast<unsigned char>(c)));
+    // Southern Stars tables: their own set of columns, identifiers and names last.
+    const std::vector<std::string> columns = SplitCsvLine(lower);
+    auto has = [&](const char* name) {
+        for (const std::string& column : columns) {
+            if (column == name)
+                return true;
+        }
+        return false;
+    };
+    if (has("ra") && has("dec") && has("dist") && has("spec") && has("ids") && has("names"))
+        return InputFormat::SouthernStars;
     if (lower.find("hip") != std::string::npos && lower.find("dist") != std::string::npos
         && lower.find("absmag") != std::string::npos)
         return InputFormat::Hyg;
@@ -92,10 +105,10 @@ private:
     char fBuffer[1 << 16];
 };
 
-// Reads the stars of options.input, refusing a file that is no catalogue at all.
-void ReadInput(const ImportOptions& options, std::vector<ImportStar>& stars, ImportReport& report)
+// Reads the stars of file, refusing a file that is no catalogue at all.
+void ReadInput(const std::string& file, InputFormat givenFormat, std::vector<ImportStar>& stars,
+    ImportReport& report)
 {
-    const std::string& file = options.input;
     struct stat st;
     if (stat(file.c_str(), &st) == 0 && S_ISDIR(st.st_mode))
         throw ImportError(file, 0, "is a directory, not a catalogue");
@@ -105,7 +118,7 @@ void ReadInput(const ImportOptions& options, std::vector<ImportStar>& stars, Imp
     std::string first;
     if (!std::getline(in, first) || (first.empty() && in.peek() == EOF))
         throw ImportError(file, 0, "the file is empty");
-    InputFormat format = options.format;
+    InputFormat format = givenFormat;
     if (format == InputFormat::Guess)
         format = GuessFormat(first);
     if (format == InputFormat::Guess)
@@ -127,6 +140,9 @@ void ReadInput(const ImportOptions& options, std::vector<ImportStar>& stars, Imp
     case InputFormat::Csv:
         ReadPlainCsv(whole, file, stars, report);
         break;
+    case InputFormat::SouthernStars:
+        ReadSouthernStars(whole, file, stars, report);
+        break;
     case InputFormat::Guess:
         break;
     }
@@ -146,11 +162,41 @@ void ReadInput(const ImportOptions& options, std::vector<ImportStar>& stars, Imp
 void CheckInputIsNotOutput(const ImportOptions& options)
 {
     struct stat input, output;
-    if (options.generate < 0 && stat(options.input.c_str(), &input) == 0
-        && stat(CatalogueTarget(options.output).c_str(), &output) == 0
-        && input.st_dev == output.st_dev && input.st_ino == output.st_ino)
-        throw ImportError(options.input, 0,
-            "is the output " + options.output + " too; write the catalogue to another file");
+    if (stat(CatalogueTarget(options.output).c_str(), &output) != 0)
+        return;
+    std::vector<std::string> inputs = options.add;
+    inputs.insert(inputs.end(), options.annotate.begin(), options.annotate.end());
+    if (options.generate < 0)
+        inputs.push_back(options.input);
+    for (const std::string& file : inputs) {
+        if (stat(file.c_str(), &input) == 0 && input.st_dev == output.st_dev
+            && input.st_ino == output.st_ino)
+            throw ImportError(file, 0,
+                "is the output " + options.output + " too; write the catalogue to another file");
+    }
+}
+
+// Brings the catalogues of --annotate, then those of --add, into the stars.
+void Merge(const ImportOptions& options, std::vector<ImportStar>& stars, ImportResult& result)
+{
+    for (const std::string& file : options.annotate) {
+        MergeReport merge;
+        merge.read.source = file;
+        std::vector<ImportStar> labels;
+        ReadInput(file, InputFormat::Guess, labels, merge.read);
+        AnnotateStars(stars, labels, merge);
+        result.merges.push_back(std::move(merge));
+    }
+    for (const std::string& file : options.add) {
+        MergeReport merge;
+        merge.read.source = file;
+        std::vector<ImportStar> extra;
+        ReadInput(file, InputFormat::Guess, extra, merge.read);
+        AddStars(stars, std::move(extra), merge);
+        result.merges.push_back(std::move(merge));
+    }
+    if (!options.add.empty() || !options.annotate.empty())
+        result.lettered = LetterSharedNames(stars);
 }
 
 void Import(const ImportOptions& options, ImportResult& result)
@@ -160,8 +206,11 @@ void Import(const ImportOptions& options, ImportResult& result)
         result.report.format = "generated";
         GenerateStars(options.generate, options.seed, stars, result.report);
     } else {
-        ReadInput(options, stars, result.report);
+        ReadInput(options.input, options.format, stars, result.report);
     }
+    Merge(options, stars, result);
+    for (const ImportStar& star : stars)
+        result.names[star.nameKind]++;
     result.summary = WriteCatalogue(options.output, stars, GroupSystems(stars));
 }
 
@@ -199,6 +248,66 @@ std::string DescribeImport(const ImportResult& result)
     if (r.classesFromColour > 0)
         out << "Spectral class estimated from the B-V colour for " << Thousands(r.classesFromColour)
             << " stars.\n";
+    if (r.classesFromMagnitude > 0)
+        out << "Spectral class estimated from the absolute magnitude for "
+            << Thousands(r.classesFromMagnitude) << " stars.\n";
+    for (const MergeReport& m : result.merges) {
+        const ImportReport& read = m.read;
+        out << (m.adds ? "Added " : "Annotated with ") << read.source << " (" << read.format
+            << "): read " << Thousands(read.read) << " stars";
+        if (read.Skipped() > 0) {
+            out << ", skipped " << Thousands(read.Skipped()) << " (";
+            bool first = true;
+            for (const auto& [reason, count] : read.skipped) {
+                out << (first ? "" : ", ") << Thousands(count) << " " << reason;
+                first = false;
+            }
+            out << ")";
+        }
+        out << ".\n  " << Thousands(m.matched) << " matched a star already there";
+        if (m.adds)
+            out << " and replaced it, " << Thousands(m.added) << " added";
+        else
+            out << ", " << Thousands(read.read - read.Skipped() - m.matched) << " matched none";
+        out << "; changed: " << Thousands(m.typesChanged) << " spectral types, "
+            << Thousands(m.namesChanged) << " names.\n";
+        if (read.classesFromColour > 0)
+            out << "  Spectral class estimated from the B-V colour for "
+                << Thousands(read.classesFromColour) << " stars.\n";
+        if (read.classesFromMagnitude > 0)
+            out << "  Spectral class estimated from the absolute magnitude for "
+                << Thousands(read.classesFromMagnitude) << " stars.\n";
+        if (read.magnitudesFromClass > 0)
+            out << "  Absolute magnitude estimated from the spectral type (main sequence) for "
+                << Thousands(read.magnitudesFromClass) << " stars without a V magnitude.\n";
+        if (read.classesAssumed > 0)
+            out << "  Neither magnitude nor usable type for " << Thousands(read.classesAssumed)
+                << " stars, taken for red dwarfs (M, absolute magnitude "
+                << "of an M4 dwarf).\n";
+    }
+    if (result.lettered > 0)
+        out << "Component letters given to " << Thousands(result.lettered)
+            << " stars that shared a name.\n";
+    if (!result.names.empty()) {
+        static constexpr std::pair<NameKind, const char*> kKinds[] = {
+            { NameKind::Proper, "common names" },
+            { NameKind::Designation, "Bayer or Flamsteed designations" },
+            { NameKind::Gliese, "Gliese numbers" },
+            { NameKind::HenryDraper, "HD numbers" },
+            { NameKind::Other, "other catalogue names" },
+            { NameKind::Position, "names built from the position" },
+        };
+        out << "Names:";
+        bool first = true;
+        for (const auto& [kind, what] : kKinds) {
+            const auto found = result.names.find(kind);
+            if (found == result.names.end())
+                continue;
+            out << (first ? " " : ", ") << Thousands(found->second) << " " << what;
+            first = false;
+        }
+        out << ".\n";
+    }
     const WriteSummary& s = result.summary;
     out << "Wrote " << Thousands(s.systems) << " systems of " << Thousands(s.stars)
         << " stars, the Sun first:\n";
@@ -231,8 +340,18 @@ Options:
                       input catalogue itself, which an import must not overwrite.
                       Ctrl-C, SIGTERM and SIGHUP remove the temporary file; the one a
                       killed import leaves is removed by the next import into the folder.
-  --format=FORMAT     kstars, hyg or csv; without it the first line decides. INPUT may be
-                      a pipe, such as /dev/stdin.
+  --format=FORMAT     kstars, hyg, csv or southern; without it the first line decides.
+                      INPUT may be a pipe, such as /dev/stdin.
+  --add=FILE          every star of FILE joins the sky with FILE's position, distance,
+                      magnitude, spectral type and name; a star of INPUT that matches one
+                      (see Matching) is replaced by it, so the star appears once. For a
+                      catalogue better than INPUT, such as the nearest stars. May be given
+                      more than once; the format is told from the first line.
+  --annotate=FILE     stars of INPUT that match a star of FILE take its published spectral
+                      type, and its name when that is of a kind at least as good (a common
+                      name before a Bayer or Flamsteed designation, then Gliese, HD, any
+                      other, the position). FILE's other stars are not added. Applied
+                      before --add; may be given more than once.
   --generate=COUNT    write a synthetic catalogue of COUNT stars instead (for benchmarks),
                       from 1 to 100,000,000: more would not fit in a desktop's memory.
   --seed=N            seed of the synthetic catalogue (default 1); the same seed gives the
@@ -253,6 +372,20 @@ Input formats:
   csv     Any CSV with a header row naming its columns: name, ra and dec in degrees,
           parallax in milliarcseconds or distance in parsecs, mag (apparent V) or absmag,
           and optionally spect and bv. Suits extracts from Gaia and other surveys.
+  southern
+          The star tables of Southern Stars Group (SSCore, SSData/Stars; "Star data:
+          Southern Stars Group, SSCore, SSData/Stars"): Nearest.csv, every known star within
+          10 parsecs, and Brightest.csv, the Bright Star catalogue. A header row, then RA
+          "h m s" and Dec "+d m s" (J2000), V and B magnitudes, Dist in parsecs, Spec as
+          published, IDs and Names separated by semicolons. The name is the fullest common
+          name ("Proxima Centauri" of "Proxima Cen;Proxima Centauri"), else the Bayer, else
+          the Flamsteed designation written out, else the GJ, else the HD number. A type
+          longer than 7 characters keeps its first star and its luminosity class
+          ("G8III+G1III" is "G8III"). A row without V gets the absolute magnitude of a
+          main-sequence star (a white dwarf for class D) of its type; without a type, the
+          class follows from B-V, else from the absolute magnitude on the main sequence;
+          with neither V nor type the star is taken for a red dwarf. Rows without a
+          distance are skipped.
 
 What is written:
   Position: x = d cos(dec) cos(ra), y = d sin(dec), z = d cos(dec) sin(ra), d = 1000 /
@@ -267,6 +400,19 @@ What is written:
   Out of range is bad input: declination beyond +-90 degrees, right ascension outside
   0-24 h (kstars, hyg) or 0-360 degrees (csv), a parallax or distance placing a star beyond
   1,000,000 pc or nearer than 1 AU, a magnitude (apparent or absolute) outside -30..40.
+
+Matching (--add, --annotate):
+  A star of FILE and one of INPUT are the same star when they lie within 5 arcseconds of
+  each other on the sky and their V magnitudes differ by at most 1.0; or, failing that,
+  within 60 arcseconds, 0.25 magnitudes and 10% in distance (catalogues place the stars of
+  close pairs differently). Both give J2000 positions. The closest pairs are taken first,
+  each star in one pair at most; names are never compared. Stars of FILE without a V
+  magnitude are not matched but added. After merging, stars that share a name get
+  component letters, brightest first ("61 Cygni A", "61 Cygni B").
+
+The default sky of the build:
+  nightdome-import --format=kstars /usr/share/kstars/stars.dat \
+      --annotate=data/southern-stars/Brightest.csv --add=data/southern-stars/Nearest.csv
 
 Star systems:
   Two stars are one system when they are at most 5,000 AU apart across the line of sight

@@ -2,12 +2,15 @@
 // systems, write the program's catalogue, and describe what was done.
 #pragma once
 
+#include "tools/importer/CatalogueMerge.h"
 #include "tools/importer/CatalogueWriter.h"
 #include "tools/importer/ImportStar.h"
 
+#include <map>
 #include <string>
+#include <vector>
 
-enum class InputFormat { Guess, KStars, Hyg, Csv };
+enum class InputFormat { Guess, KStars, Hyg, Csv, SouthernStars };
 
 struct ImportOptions {
     InputFormat format = InputFormat::Guess;
@@ -15,11 +18,18 @@ struct ImportOptions {
     std::string output = "stars.dat";
     int64_t generate = -1; // a synthetic catalogue of this many stars instead of input
     uint64_t seed = 1;
+    // Catalogues whose stars all join the input's, replacing the stars they match (--add).
+    std::vector<std::string> add;
+    // Catalogues whose types and names go to the input's stars they match (--annotate).
+    std::vector<std::string> annotate;
 };
 
 struct ImportResult {
     ImportReport report;
     WriteSummary summary;
+    std::vector<MergeReport> merges; // the annotating catalogues first, then the added ones
+    int64_t lettered = 0; // names given component letters
+    std::map<NameKind, int64_t> names; // the stars written (the Sun aside) by kind of name
 };
 
 // Throws ImportError for bad input or output, for an input that is the output itself, for an

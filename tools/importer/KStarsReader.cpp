@@ -105,6 +105,7 @@ void ReadKStars(
             } else {
                 type = "?";
             }
+            star.classEstimated = true;
         }
         star.spectralClass = type;
 
@@ -118,8 +119,10 @@ void ReadKStars(
             if (second != std::string::npos)
                 common = rest.substr(second + 1);
         }
-        star.name = ChooseName(
-            { common, ReadableDesignation(designation), designation }, star.ra, star.dec);
+        NameStar(star,
+            { { common, NameKind::Proper },
+                { ReadableDesignation(designation), NameKind::Designation },
+                { designation, NameKind::Other } });
         stars.push_back(std::move(star));
     }
     if (in.bad())

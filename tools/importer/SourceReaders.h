@@ -25,6 +25,12 @@ void ReadHyg(std::istream& in, const std::string& file, std::vector<ImportStar>&
 void ReadPlainCsv(std::istream& in, const std::string& file, std::vector<ImportStar>& stars,
     ImportReport& report);
 
+// The star tables of Southern Stars Group (SSCore, SSData/Stars: Nearest.csv, Brightest.csv):
+// a header row, then RA "h m s", Dec "+d m s" (J2000), V and B magnitudes, Dist in parsecs,
+// Spec as published, IDs and Names separated by semicolons.
+void ReadSouthernStars(std::istream& in, const std::string& file, std::vector<ImportStar>& stars,
+    ImportReport& report);
+
 // A deterministic synthetic catalogue of count stars for benchmarks: names, classes,
 // magnitudes and positions drawn from seed, about one star in eight a companion of the star
 // before it at the same position.

@@ -67,8 +67,18 @@ int main(int argc, char** argv)
                 options.format = InputFormat::Hyg;
             else if (value == "csv")
                 options.format = InputFormat::Csv;
+            else if (value == "southern")
+                options.format = InputFormat::SouthernStars;
             else
-                return Usage("unknown format '" + value + "' (kstars, hyg or csv)");
+                return Usage("unknown format '" + value + "' (kstars, hyg, csv or southern)");
+        } else if (Value(arg, "--add", &value)) {
+            if (value.empty())
+                return Usage("--add needs a file name");
+            options.add.push_back(value);
+        } else if (Value(arg, "--annotate", &value)) {
+            if (value.empty())
+                return Usage("--annotate needs a file name");
+            options.annotate.push_back(value);
         } else if (Value(arg, "--generate", &value)) {
             if (!WholeNumber(value, &options.generate) || options.generate < 1
                 || options.generate > kMaxGenerated)
