@@ -152,6 +152,9 @@ TEST_F(ImporterTest, CommandReportsWhatItDid)
     ASSERT_EQ(Run("--help", &output), 0);
     EXPECT_NE(output.find("Star systems:"), std::string::npos);
     EXPECT_NE(output.find("5,000 AU"), std::string::npos);
+    // The shipped star tables are credited as their author asks.
+    EXPECT_NE(output.find("\"Star data: Southern Stars Group, SSCore, SSData/Stars\""),
+        std::string::npos);
 }
 
 // Bad input: a clear message with file, line and reason, a non-zero exit, and the catalogue

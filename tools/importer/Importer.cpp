@@ -373,19 +373,19 @@ Input formats:
           parallax in milliarcseconds or distance in parsecs, mag (apparent V) or absmag,
           and optionally spect and bv. Suits extracts from Gaia and other surveys.
   southern
-          The star tables of Southern Stars Group (SSCore, SSData/Stars; "Star data:
-          Southern Stars Group, SSCore, SSData/Stars"): Nearest.csv, every known star within
-          10 parsecs, and Brightest.csv, the Bright Star catalogue. A header row, then RA
-          "h m s" and Dec "+d m s" (J2000), V and B magnitudes, Dist in parsecs, Spec as
-          published, IDs and Names separated by semicolons. The name is the fullest common
-          name ("Proxima Centauri" of "Proxima Cen;Proxima Centauri"), else the Bayer, else
-          the Flamsteed designation written out, else the GJ, else the HD number. A type
-          longer than 7 characters keeps its first star and its luminosity class
-          ("G8III+G1III" is "G8III"). A row without V gets the absolute magnitude of a
-          main-sequence star (a white dwarf for class D) of its type; without a type, the
-          class follows from B-V, else from the absolute magnitude on the main sequence;
-          with neither V nor type the star is taken for a red dwarf. Rows without a
-          distance are skipped.
+          The star tables of Southern Stars Group, free for any use with credit:
+          "Star data: Southern Stars Group, SSCore, SSData/Stars". Nearest.csv holds every
+          known star within 10 parsecs, Brightest.csv the Bright Star catalogue. A header
+          row, then RA "h m s" and Dec "+d m s" (J2000), V and B magnitudes, Dist in
+          parsecs, Spec as published, IDs and Names separated by semicolons. The name is
+          the fullest common name ("Proxima Centauri" of "Proxima Cen;Proxima Centauri"),
+          else the Bayer, else the Flamsteed designation written out, else the GJ, else
+          the HD number. A type longer than 7 characters keeps its first star and its
+          luminosity class ("G8III+G1III" is "G8III"). A row without V gets the absolute
+          magnitude of a main-sequence star (a white dwarf for class D) of its type;
+          without a type, the class follows from B-V, else from the absolute magnitude on
+          the main sequence; with neither V nor type the star is taken for a red dwarf.
+          Rows without a distance are skipped.
 
 What is written:
   Position: x = d cos(dec) cos(ra), y = d sin(dec), z = d cos(dec) sin(ra), d = 1000 /
@@ -407,8 +407,9 @@ Matching (--add, --annotate):
   within 60 arcseconds, 0.25 magnitudes and 10% in distance (catalogues place the stars of
   close pairs differently). Both give J2000 positions. The closest pairs are taken first,
   each star in one pair at most; names are never compared. Stars of FILE without a V
-  magnitude are not matched but added. After merging, stars that share a name get
-  component letters, brightest first ("61 Cygni A", "61 Cygni B").
+  magnitude are not matched but added. After merging, stars that share a name and lie
+  within a parsec of the brightest of them get component letters, brightest first
+  ("61 Cygni A", "61 Cygni B").
 
 The default sky of the build:
   nightdome-import --format=kstars /usr/share/kstars/stars.dat \
