@@ -16,19 +16,21 @@
 
 #include <cmath>
 #include <cstring>
+#include <regex>
 #include <sstream>
 
 namespace {
 
-const char* kHeader = "Type,RA,Dec,pmRA,pmDec,V,B,Dist,RV,Spec,Comp,Delta,Sep,PA,Year,T,a,e,i,w,n,"
-                      "P,Vtype,Vmin,Vmax,Vper,Vepoch,IDs,Names,\n";
+const char* kHeader
+    = "Type,RA,Dec,pmRA,pmDec,V,B,Dist,RV,SpType,Comp,Delta,Sep,PA,Year,T,a,e,i,w,n,"
+      "P,Vtype,Vmin,Vmax,Vper,Vepoch,IDs,Names,\n";
 
 // A row with the columns the reader uses; the others empty.
 std::string Row(const std::string& ra, const std::string& dec, const std::string& v,
-    const std::string& b, const std::string& dist, const std::string& spec, const std::string& ids,
+    const std::string& b, const std::string& dist, const std::string& type, const std::string& ids,
     const std::string& names)
 {
-    return "SS," + ra + "," + dec + ",,," + v + "," + b + "," + dist + ",," + spec
+    return "SS," + ra + "," + dec + ",,," + v + "," + b + "," + dist + ",," + type
         + ",,,,,,,,,,,,,,,,,," + ids + "," + names + ",\n";
 }
 
@@ -70,6 +72,19 @@ TEST(SouthernStars, TheHeaderTellsTheFormat)
 {
     EXPECT_EQ(
         GuessFormat(std::string(kHeader, std::strlen(kHeader) - 1)), InputFormat::SouthernStars);
+    // SSCore's own files head the type column differently; it is the column after RV.
+    const std::string original
+        = std::regex_replace(std::string(kHeader), std::regex(",SpType,"), ",Sp,");
+    EXPECT_EQ(GuessFormat(original.substr(0, original.size() - 1)), InputFormat::SouthernStars);
+    std::istringstream in(original
+        + Row(
+            "14 29 42.95", "-62 40 46.2", "+11.13", "", "1.302", "M5.5V", "", "Proxima Centauri"));
+    std::vector<ImportStar> stars;
+    ImportReport report;
+    ReadSouthernStars(in, "Nearest.csv", stars, report);
+    ASSERT_EQ(stars.size(), 1u);
+    EXPECT_EQ(stars[0].spectralClass, "M5.5V");
+    EXPECT_FALSE(stars[0].classEstimated);
     // HYG and plain CSV headers stay theirs.
     EXPECT_EQ(
         GuessFormat("id,hip,hd,hr,gl,bf,proper,ra,dec,dist,mag,absmag,spect"), InputFormat::Hyg);
@@ -218,7 +233,7 @@ TEST(SouthernStars, BadRowsNameTheFileAndTheLine)
         "Nearest.csv:2: V 50 out of range -30..40");
     EXPECT_EQ(ReadError(Row("01 00 00", "+10 00 00", "5", "", "1e-300", "M5V", "", "")),
         "Nearest.csv:2: dist 1e-300 pc places the star nearer than 1 AU");
-    std::istringstream noDistance("Type,RA,Dec,V,Spec,IDs,Names\n");
+    std::istringstream noDistance("Type,RA,Dec,V,SpType,IDs,Names\n");
     std::vector<ImportStar> stars;
     ImportReport report;
     try {

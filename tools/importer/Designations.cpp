@@ -304,15 +304,25 @@ std::string CleanSpectralClass(const std::string& type)
     return out;
 }
 
-std::string WrittenOutDesignation(const std::string& id)
+std::vector<std::string> Words(const std::string& text)
 {
     std::vector<std::string> words;
-    for (size_t i = 0; i < id.size();) {
-        const size_t end = std::min(id.find(' ', i), id.size());
-        if (end > i)
-            words.push_back(id.substr(i, end - i));
-        i = end + 1;
+    size_t i = 0;
+    while (i < text.size()) {
+        while (i < text.size() && text[i] == ' ')
+            i++;
+        const size_t begin = i;
+        while (i < text.size() && text[i] != ' ')
+            i++;
+        if (i > begin)
+            words.push_back(text.substr(begin, i - begin));
     }
+    return words;
+}
+
+std::string WrittenOutDesignation(const std::string& id)
+{
+    const std::vector<std::string> words = Words(id);
     if (words.size() < 2 || words.size() > 3)
         return {};
     const std::string genitive = ConstellationGenitive(words[1]);

@@ -6,12 +6,16 @@
 
 #include <initializer_list>
 #include <string>
+#include <vector>
 
 // "alp CMa" -> "Alpha Canis Majoris", "alp1Cen" and "Alp2Cen" -> "Alpha1 Centauri" and
 // "Alpha2 Centauri", "pi 2Col" -> "Pi2 Columbae", "61 Cyg" -> "61 Cygni", "9Alp CMa" -> "Alpha
 // Canis Majoris" (the Greek letter is preferred to the Flamsteed number). Empty when the text
 // is no designation of this kind.
 std::string ReadableDesignation(const std::string& designation);
+
+// The parts of a text separated by blanks.
+std::vector<std::string> Words(const std::string& text);
 
 // A Bayer or Flamsteed designation as other catalogues spell it, written out: "alpha1 Cen" ->
 // "Alpha1 Centauri", "61 Cyg" -> "61 Cygni", "p Eri" -> "p Eridani", "xi UMa Bb" -> "Xi Ursae

@@ -64,7 +64,7 @@ InputFormat GuessFormat(const std::string& firstLine)
         }
         return false;
     };
-    if (has("ra") && has("dec") && has("dist") && has("spec") && has("ids") && has("names"))
+    if (has("ra") && has("dec") && has("dist") && has("rv") && has("ids") && has("names"))
         return InputFormat::SouthernStars;
     if (lower.find("hip") != std::string::npos && lower.find("dist") != std::string::npos
         && lower.find("absmag") != std::string::npos)
@@ -179,22 +179,21 @@ void CheckInputIsNotOutput(const ImportOptions& options)
 // Brings the catalogues of --annotate, then those of --add, into the stars.
 void Merge(const ImportOptions& options, std::vector<ImportStar>& stars, ImportResult& result)
 {
-    for (const std::string& file : options.annotate) {
+    auto bringIn = [&](const std::string& file, bool adds) {
         MergeReport merge;
         merge.read.source = file;
-        std::vector<ImportStar> labels;
-        ReadInput(file, InputFormat::Guess, labels, merge.read);
-        AnnotateStars(stars, labels, merge);
+        std::vector<ImportStar> other;
+        ReadInput(file, InputFormat::Guess, other, merge.read);
+        if (adds)
+            AddStars(stars, std::move(other), merge);
+        else
+            AnnotateStars(stars, other, merge);
         result.merges.push_back(std::move(merge));
-    }
-    for (const std::string& file : options.add) {
-        MergeReport merge;
-        merge.read.source = file;
-        std::vector<ImportStar> extra;
-        ReadInput(file, InputFormat::Guess, extra, merge.read);
-        AddStars(stars, std::move(extra), merge);
-        result.merges.push_back(std::move(merge));
-    }
+    };
+    for (const std::string& file : options.annotate)
+        bringIn(file, false);
+    for (const std::string& file : options.add)
+        bringIn(file, true);
     if (!options.add.empty() || !options.annotate.empty())
         result.lettered = LetterSharedNames(stars);
 }
@@ -377,7 +376,8 @@ Input formats:
           "Star data: Southern Stars Group, SSCore, SSData/Stars". Nearest.csv holds every
           known star within 10 parsecs, Brightest.csv the Bright Star catalogue. A header
           row, then RA "h m s" and Dec "+d m s" (J2000), V and B magnitudes, Dist in
-          parsecs, Spec as published, IDs and Names separated by semicolons. The name is
+          parsecs, the spectral type as published right after RV, IDs and Names separated
+          by semicolons. The name is
           the fullest common name ("Proxima Centauri" of "Proxima Cen;Proxima Centauri"),
           else the Bayer, else the Flamsteed designation written out, else the GJ, else
           the HD number. A type longer than 7 characters keeps its first star and its

@@ -27,7 +27,7 @@ void ReadPlainCsv(std::istream& in, const std::string& file, std::vector<ImportS
 
 // The star tables of Southern Stars Group (SSCore, SSData/Stars: Nearest.csv, Brightest.csv):
 // a header row, then RA "h m s", Dec "+d m s" (J2000), V and B magnitudes, Dist in parsecs,
-// Spec as published, IDs and Names separated by semicolons.
+// the spectral type as published right after RV, IDs and Names separated by semicolons.
 void ReadSouthernStars(std::istream& in, const std::string& file, std::vector<ImportStar>& stars,
     ImportReport& report);
 

@@ -11,23 +11,6 @@
 
 namespace {
 
-// The parts of a field separated by blanks.
-std::vector<std::string> Words(const std::string& text)
-{
-    std::vector<std::string> words;
-    size_t i = 0;
-    while (i < text.size()) {
-        while (i < text.size() && text[i] == ' ')
-            i++;
-        const size_t begin = i;
-        while (i < text.size() && text[i] != ' ')
-            i++;
-        if (i > begin)
-            words.push_back(text.substr(begin, i - begin));
-    }
-    return words;
-}
-
 std::vector<std::string> Split(const std::string& text, char separator)
 {
     std::vector<std::string> parts;
@@ -115,7 +98,11 @@ void ReadSouthernStars(
     const size_t dist = table.Require({ "dist" }, "distance (parsecs)");
     const auto v = table.Find({ "v" });
     const auto b = table.Find({ "b" });
-    const auto spec = table.Find({ "spec" });
+    // The published spectral type: "SpType" in the copies the program ships; SSCore's own files
+    // head it differently, but always put it right after RV.
+    auto type = table.Find({ "sptype" });
+    if (const auto rv = table.Find({ "rv" }); !type && rv)
+        type = *rv + 1;
     const auto ids = table.Find({ "ids" });
     const auto names = table.Find({ "names" });
 
@@ -137,7 +124,7 @@ void ReadSouthernStars(
         star.ra = raHours / 24 * (kPI + kPI);
         star.dec = decDegrees / 180 * kPI;
         star.parallax = ParsecsFromParallax(*distance); // 1000 / pc is mas, as 1000 / mas is pc
-        const std::string published = ShortSpectralType(table.Text(spec));
+        const std::string published = ShortSpectralType(table.Text(type));
         const auto visual = table.OptionalNumber(v, "V");
         const auto blue = table.OptionalNumber(b, "B");
         if (visual) {
