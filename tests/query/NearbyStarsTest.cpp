@@ -49,7 +49,7 @@ const std::vector<NearbySystem> kSystems = {
     { 10, 56, 29.20, 1, 7, 0, 53.0, 2.4086, { { "Wolf 359", "M6V", 16.55 } } },
     { 11, 3, 20.19, 1, 35, 58, 11.6, 2.5468, { { "Lalande 21185", "M2V", 10.48 } } },
     { 6, 45, 8.92, -1, 16, 42, 58.0, 2.6371,
-        { { "Sirius A", "A1V", 1.42 }, { "Sirius B", "DA2", 11.18 } } },
+        { { "Sirius", "A1V", 1.42 }, { "Sirius B", "DA2", 11.18 } } },
     { 1, 39, 1.3, -1, 17, 57, 1.0, 2.68,
         { { "Luyten 726-8 A", "M5.5V", 15.4 }, { "UV Ceti", "M6V", 15.9 } } },
     { 18, 49, 49.36, -1, 23, 50, 10.4, 2.9730, { { "Ross 154", "M3.5V", 13.07 } } },
@@ -58,7 +58,7 @@ const std::vector<NearbySystem> kSystems = {
     { 21, 6, 53.94, 1, 38, 44, 57.9, 3.4965,
         { { "61 Cygni A", "K5V", 7.49 }, { "61 Cygni B", "K7V", 8.31 } } },
     { 7, 39, 18.12, 1, 5, 13, 30.0, 3.5142,
-        { { "Procyon A", "F5IV-V", 2.66 }, { "Procyon B", "DQZ", 13.0 } } },
+        { { "Procyon", "F5IV-V", 2.66 }, { "Procyon B", "DQZ", 13.0 } } },
     { 0, 18, 22.89, 1, 44, 1, 22.6, 3.5624, { { "Groombridge 34", "M1.5V", 10.32 } } },
     { 22, 3, 21.66, -1, 56, 47, 9.5, 3.6481, { { "Epsilon Indi", "K5V", 6.89 } } },
     { 1, 44, 4.08, -1, 15, 56, 14.9, 3.6522, { { "Tau Ceti", "G8V", 5.68 } } },
@@ -201,7 +201,7 @@ TEST_F(NearbyStars, NamesByCommonName)
     EXPECT_EQ(Matches(query, &param), Indices({ "Barnard's Star" }));
     param.text = "sirius b";
     param.caseSensitive = false;
-    EXPECT_EQ(Matches(query, &param), Indices({ "Sirius A" }));
+    EXPECT_EQ(Matches(query, &param), Indices({ "Sirius" }));
     param.text = "centauri";
     EXPECT_EQ(Matches(query, &param), Indices({ "Alpha Centauri A", "Proxima Centauri" }));
     param.text = "Ceti";
@@ -209,6 +209,8 @@ TEST_F(NearbyStars, NamesByCommonName)
     param.mode = kNameIs;
     param.text = "VEGA";
     EXPECT_EQ(Matches(query, &param), Indices({ "Vega" }));
+    param.text = "sirius";
+    EXPECT_EQ(Matches(query, &param), Indices({ "Sirius" }));
     param.mode = kNameStartsWith;
     param.text = "epsilon";
     EXPECT_EQ(Matches(query, &param), Indices({ "Epsilon Eridani", "Epsilon Indi" }));
@@ -221,7 +223,7 @@ TEST_F(NearbyStars, RightAscensionFindsStarsByTheirCoordinates)
     RAQueryParam param { kQueryIs, RightAscension(kSystems[IndexOf("Alpha Centauri A")]) };
     EXPECT_EQ(Matches(query, &param), Indices({ "Alpha Centauri A" }));
     param.rightAscension = (6 + 45.0 / 60) * 15 * kPI / 180;
-    EXPECT_EQ(Matches(query, &param), Indices({ "Sirius A" }));
+    EXPECT_EQ(Matches(query, &param), Indices({ "Sirius" }));
     // Before 2h; the Sun, on no axis, counts as right ascension 0.
     param.mode = kQueryLessThan;
     param.rightAscension = 2 * 15 * kPI / 180;
@@ -280,7 +282,7 @@ TEST_F(NearbyStars, SpectralClassAndMagnitude)
     const std::set<int32_t> faintPrimaries = Matches(mg, &mgParam);
     mgParam.starMode = kFirstOrSecondStar;
     const std::set<int32_t> faintFirstOrSecond = Matches(mg, &mgParam);
-    EXPECT_EQ(faintPrimaries.count(IndexOf("Sirius A")), 0u);
-    EXPECT_EQ(faintFirstOrSecond.count(IndexOf("Sirius A")), 1u);
-    EXPECT_EQ(faintFirstOrSecond.count(IndexOf("Procyon A")), 1u);
+    EXPECT_EQ(faintPrimaries.count(IndexOf("Sirius")), 0u);
+    EXPECT_EQ(faintFirstOrSecond.count(IndexOf("Sirius")), 1u);
+    EXPECT_EQ(faintFirstOrSecond.count(IndexOf("Procyon")), 1u);
 }

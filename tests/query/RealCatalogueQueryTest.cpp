@@ -98,5 +98,26 @@ TEST(RealCatalogueQueries, NameContainsFindsACommonName)
     EXPECT_EQ(query.GetSysMask(&mask, const_cast<NameQueryParam*>(&param)), 1);
     const int32_t index = mask.FindFirst();
     ASSERT_GE(index, 0);
-    EXPECT_STREQ(u.SystemAt(index)->GetName(), "Sirius A");
+    EXPECT_STREQ(u.SystemAt(index)->GetName(), "Sirius");
+}
+
+TEST(RealCatalogueQueries, NameIsFindsAPrimaryByItsBareName)
+{
+    Universe& u = const_cast<Universe&>(RealUniverse());
+    ASSERT_GT(u.CountItems(), 0);
+    StarNameQuery query(&u);
+    NameQueryParam param { kNameIs, "Sirius", true };
+    StarSysMask mask(u.CountItems(), false, 0);
+    EXPECT_EQ(query.GetSysMask(&mask, &param), 1);
+    const int32_t index = mask.FindFirst();
+    ASSERT_GE(index, 0);
+    const StarSystem* sirius = u.SystemAt(index);
+    EXPECT_STREQ(sirius->GetName(), "Sirius");
+    ASSERT_EQ(sirius->CountItems(), 2);
+    EXPECT_STREQ(sirius->StarAt(1)->GetName(), "Sirius B");
+    // The companion is found by its own name, in the same system.
+    param.text = "Sirius B";
+    StarSysMask companion(u.CountItems(), false, 0);
+    EXPECT_EQ(query.GetSysMask(&companion, &param), 1);
+    EXPECT_EQ(companion.FindFirst(), index);
 }

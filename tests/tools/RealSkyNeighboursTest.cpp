@@ -95,17 +95,41 @@ TEST_F(RealSky, TheFaintNeighbours)
 
 TEST_F(RealSky, SiriusBIsAWhiteDwarfInSiriussSystem)
 {
-    const StarSystem* sirius = FindSystem(Sky(), "Sirius A");
+    const StarSystem* sirius = FindSystem(Sky(), "Sirius");
     ASSERT_NE(sirius, nullptr);
     ASSERT_EQ(sirius, FindSystem(Sky(), "Sirius B"));
     ASSERT_EQ(sirius->CountItems(), 2);
-    EXPECT_STREQ(sirius->StarAt(0)->GetName(), "Sirius A");
+    EXPECT_STREQ(sirius->StarAt(0)->GetName(), "Sirius");
+    EXPECT_STREQ(sirius->GetName(), "Sirius");
     const Star* b = sirius->StarAt(1);
     EXPECT_STREQ(b->GetName(), "Sirius B");
     EXPECT_STREQ(b->GetSpectralClassString(), "DA1.9");
     // Far below the main sequence: an A star of the main sequence is near magnitude 1.
     EXPECT_GT(b->magnitude, 10);
     EXPECT_EQ(b->spectralClass.harvardClass, kClassA);
+}
+
+// The primaries the table names both bare and with the letter A carry the bare name, each
+// once in the sky, in one system with the companion that keeps its letter B; no star is left
+// with the letter A.
+TEST_F(RealSky, PrimariesCarryTheirBareNames)
+{
+    std::map<std::string, int> named;
+    for (int32_t i = 0; i < Sky().CountItems(); i++) {
+        const StarSystem* s = Sky().SystemAt(i);
+        for (int32_t j = 0; j < s->CountItems(); j++)
+            named[s->StarAt(j)->GetName()]++;
+    }
+    for (const char* primary : { "Sirius", "Procyon", "Kruger 60", "Ross 614", "Stein 2051",
+             "Achird", "Ross 775", "Wolf 922" }) {
+        const std::string name = primary;
+        EXPECT_EQ(named[name], 1) << name;
+        EXPECT_EQ(named[name + " B"], 1) << name;
+        EXPECT_EQ(named.count(name + " A"), 0u) << name;
+        const StarSystem* system = FindSystem(Sky(), name);
+        ASSERT_NE(system, nullptr) << name;
+        EXPECT_EQ(system, FindSystem(Sky(), name + " B")) << name;
+    }
 }
 
 TEST_F(RealSky, BrightStarsCarryTheirPublishedTypes)

@@ -115,6 +115,36 @@ TEST(SouthernStars, ADeclinationOfMinusZeroDegreesIsSouth)
     EXPECT_NEAR(stars[0].dec * 180 / M_PI, -0.5, 1e-12);
 }
 
+// The fullest common name, but a primary listed bare and with its letter carries the bare
+// name, the one a search by whole name looks for; its companions keep their letters.
+TEST(SouthernStars, APrimaryCarriesTheBareCommonName)
+{
+    const auto stars = Read(Row("06 45 08.92", "-16 42 58.0", "-1.46", "", "2.637", "A1V",
+                                "alpha CMa;GJ 244A", "Sirius;Sirius A")
+        + Row("06 45 09.30", "-16 43 00.7", "+8.44", "", "2.670", "DA1.9", "alpha CMa;GJ 244B",
+            "Sirius;Sirius B")
+        + Row("14 29 42.95", "-62 40 46.2", "+11.13", "", "1.302", "M5.5V", "GJ 551",
+            "Proxima Cen;Proxima Centauri")
+        // the order of the names does not matter
+        + Row("07 39 18.12", "+05 13 30.0", "+0.37", "", "3.514", "F5V", "alpha CMi",
+            "Procyon A;Procyon")
+        // a letter other than A is no primary's
+        + Row("22 27 59.80", "+57 41 49.7", "+11.30", "", "4.001", "M4V", "GJ 860B",
+            "Kruger 60;Kruger 60 B")
+        // a name with the letter A keeps it when the bare name is not among the names ("Ross"
+        // only begins like it)
+        + Row("21 29 36.81", "+17 38 35.9", "+10.30", "", "6.780", "M3eV", "GJ 829A",
+            "Ross;Ross 775 A"));
+    ASSERT_EQ(stars.size(), 6u);
+    EXPECT_EQ(stars[0].name, "Sirius");
+    EXPECT_EQ(stars[0].nameKind, NameKind::Proper);
+    EXPECT_EQ(stars[1].name, "Sirius B");
+    EXPECT_EQ(stars[2].name, "Proxima Centauri");
+    EXPECT_EQ(stars[3].name, "Procyon");
+    EXPECT_EQ(stars[4].name, "Kruger 60 B");
+    EXPECT_EQ(stars[5].name, "Ross 775 A");
+}
+
 TEST(SouthernStars, NamesByKindOfName)
 {
     const auto stars = Read(
@@ -368,6 +398,20 @@ TEST(CatalogueMatch, SharedNamesGetComponentLettersBrightestFirst)
     EXPECT_EQ(stars[4].name, "Atik");
     EXPECT_EQ(stars[5].name, "Sirius B");
 
+    // A letter another star carries already is passed over: a primary that kept its bare name
+    // beside a star of the base catalogue of that name, its companion lettered by the table.
+    std::vector<ImportStar> taken = { At(101.29, -16.72, 2.637, -1.46),
+        At(101.29, -16.7201, 2.64, -1.44), At(101.2904, -16.7202, 2.670, 8.44) };
+    const char* takenNames[] = { "Sirius", "Sirius", "Sirius B" };
+    for (size_t i = 0; i < taken.size(); i++) {
+        taken[i].name = takenNames[i];
+        taken[i].nameKind = NameKind::Proper;
+    }
+    EXPECT_EQ(LetterSharedNames(taken), 2);
+    EXPECT_EQ(taken[0].name, "Sirius A");
+    EXPECT_EQ(taken[1].name, "Sirius C");
+    EXPECT_EQ(taken[2].name, "Sirius B");
+
     // A name of 79 characters keeps its letter.
     std::vector<ImportStar> longNames = { At(1, 1, 5, 5), At(1, 1.001, 5, 6) };
     for (ImportStar& star : longNames)
@@ -412,7 +456,7 @@ TEST_F(SouthernStarsImport, TheCommandMergesAndReports)
         << output;
     EXPECT_NE(output.find("Added " + nearest
                   + " (Southern Stars CSV): read 3 stars.\n  1 matched a star already there and "
-                    "replaced it, 2 added; changed: 1 spectral types, 1 names.\n"),
+                    "replaced it, 2 added; changed: 1 spectral types, 0 names.\n"),
         std::string::npos)
         << output;
     EXPECT_NE(output.find("Names: 4 common names, 1 other catalogue names.\n"), std::string::npos)
@@ -423,7 +467,9 @@ TEST_F(SouthernStarsImport, TheCommandMergesAndReports)
     ASSERT_EQ(u.CountItems(), 5);
     const StarSystem* sirius = u.SystemAt(1);
     ASSERT_EQ(sirius->CountItems(), 2);
-    EXPECT_STREQ(sirius->StarAt(0)->GetName(), "Sirius A");
+    // Sirius keeps its name: the table's primary carries it bare, its companion the letter.
+    EXPECT_STREQ(sirius->GetName(), "Sirius");
+    EXPECT_STREQ(sirius->StarAt(0)->GetName(), "Sirius");
     EXPECT_STREQ(sirius->StarAt(1)->GetName(), "Sirius B");
     EXPECT_STREQ(sirius->StarAt(1)->GetSpectralClassString(), "DA1.9");
     EXPECT_STREQ(u.SystemAt(2)->GetName(), "Capella");

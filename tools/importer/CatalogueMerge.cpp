@@ -8,6 +8,7 @@
 #include <cctype>
 #include <cmath>
 #include <map>
+#include <set>
 #include <tuple>
 
 namespace {
@@ -137,9 +138,11 @@ void AnnotateStars(
 int64_t LetterSharedNames(std::vector<ImportStar>& stars)
 {
     std::map<std::string, std::vector<size_t>> byName;
+    std::set<std::string> taken;
     for (size_t i = 0; i < stars.size(); i++) {
         if (stars[i].nameKind != NameKind::Position && !EndsInComponent(stars[i].name))
             byName[stars[i].name].push_back(i);
+        taken.insert(stars[i].name);
     }
     int64_t lettered = 0;
     for (auto& [name, members] : byName) {
@@ -167,8 +170,20 @@ int64_t LetterSharedNames(std::vector<ImportStar>& stars)
             while (!base.empty() && (base.back() & 0x80))
                 base.pop_back();
         }
+        // A letter another star already carries is passed over: a primary that keeps its bare
+        // name ("Sirius") beside a star of the base catalogue of that name has its companion
+        // "Sirius B" in the sky already.
+        std::vector<std::string> names;
+        for (char letter = 'A'; letter <= 'Z' && names.size() < members.size(); letter++) {
+            std::string candidate = base + " " + letter;
+            if (!taken.count(candidate))
+                names.push_back(std::move(candidate));
+        }
+        if (names.size() < members.size())
+            continue;
         for (size_t k = 0; k < members.size(); k++) {
-            stars[members[k]].name = base + " " + static_cast<char>('A' + k);
+            taken.insert(names[k]);
+            stars[members[k]].name = std::move(names[k]);
             lettered++;
         }
     }

@@ -46,9 +46,11 @@ void AnnotateStars(
 
 // Stars that share one name ("Fomalhaut" for the star and two wide companions, "61 Cygni" for
 // both stars of the pair) and lie within a parsec of the brightest of them get component
-// letters, brightest first: "Fomalhaut A", "B", "C". Names made from the position and names
-// that already end in a component letter are left, and so are stars far apart that share a
-// name.
+// letters, brightest first: "Fomalhaut A", "B", "C". A letter another star already carries
+// is passed over, so no name is written twice ("Sirius A", "Sirius C" beside "Sirius B").
+// Names made from the position and names that already end in a component letter are left, and
+// so are stars far apart that share a name and names shared by more stars than there are free
+// letters.
 // Returns how many names were lettered.
 int64_t LetterSharedNames(std::vector<ImportStar>& stars);
 

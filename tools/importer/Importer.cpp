@@ -379,9 +379,11 @@ Input formats:
           parsecs, the spectral type as published right after RV, IDs and Names separated
           by semicolons. The name is
           the fullest common name ("Proxima Centauri" of "Proxima Cen;Proxima Centauri"),
-          else the Bayer, else the Flamsteed designation written out, else the GJ, else
-          the HD number. A type longer than 7 characters keeps its first star and its
-          luminosity class ("G8III+G1III" is "G8III"). A row without V gets the absolute
+          but the bare one of a star named both with and without the letter A ("Sirius"
+          of "Sirius;Sirius A"; "Sirius;Sirius B" is "Sirius B"), else the Bayer, else the
+          Flamsteed designation written out, else the GJ, else the HD number. A type
+          longer than 7 characters keeps its first star and its luminosity class
+          ("G8III+G1III" is "G8III"). A row without V gets the absolute
           magnitude of a main-sequence star (a white dwarf for class D) of its type;
           without a type, the class follows from B-V, else from the absolute magnitude on
           the main sequence; with neither V nor type the star is taken for a red dwarf.
@@ -409,7 +411,7 @@ Matching (--add, --annotate):
   each star in one pair at most; names are never compared. Stars of FILE without a V
   magnitude are not matched but added. After merging, stars that share a name and lie
   within a parsec of the brightest of them get component letters, brightest first
-  ("61 Cygni A", "61 Cygni B").
+  ("61 Cygni A", "61 Cygni B"), passing over a letter another star already carries.
 
 The default sky of the build:
   nightdome-import --format=kstars /usr/share/kstars/stars.dat \

@@ -7,6 +7,7 @@
 #include "tools/importer/SpectralEstimates.h"
 #include "tools/importer/StrictNumbers.h"
 
+#include <algorithm>
 #include <cmath>
 
 namespace {
@@ -45,7 +46,7 @@ double Sexagesimal(const std::string& text, double maxFirst, const std::string& 
 }
 
 // The letters in a name: among a star's common names the one with the most is the fullest
-// ("Proxima Centauri" before "Proxima Cen", "Sirius A" before "Sirius").
+// ("Proxima Centauri" before "Proxima Cen").
 size_t Letters(const std::string& name)
 {
     size_t n = 0;
@@ -54,19 +55,36 @@ size_t Letters(const std::string& name)
     return n;
 }
 
+// The star's common name: the fullest of them, but a primary listed both bare and with its
+// letter ("Sirius;Sirius A") carries the bare name, the one people search for, and leaves the
+// letters to its companions ("Sirius;Sirius B" stays "Sirius B").
+std::string CommonName(const std::vector<std::string>& names)
+{
+    std::string fullest;
+    for (const std::string& name : names) {
+        if (std::find(names.begin(), names.end(), name + " A") != names.end())
+            return name;
+        if (Letters(name) > Letters(fullest))
+            fullest = name;
+    }
+    return fullest;
+}
+
 // The name by the order of preference: a common name, a Bayer designation, a Flamsteed
 // designation, the Gliese number, the HD number; else the position's.
 void NameFromIds(ImportStar& star, const std::string& names, const std::string& ids)
 {
     // Some common names are designations ("mu Her Aa", "alp Ps"): those count as such.
-    std::string proper, named;
+    std::string named;
+    std::vector<std::string> common;
     for (const std::string& name : Split(names, ';')) {
         const std::string written = WrittenOutDesignation(name);
         if (!written.empty() && named.empty())
             named = written;
-        else if (written.empty() && Letters(CleanName(name)) > Letters(proper))
-            proper = CleanName(name);
+        else if (written.empty())
+            common.push_back(CleanName(name));
     }
+    const std::string proper = CommonName(common);
     const std::vector<std::string> identifiers = Split(ids, ';');
     std::string bayer = named, flamsteed, gliese, hd;
     for (const std::string& id : identifiers) {
