@@ -71,6 +71,12 @@ bool ScanDouble(const char* text, double* value, const char** next)
     return true;
 }
 
+int FormatDouble(char* buffer, size_t size, const char* format, double value)
+{
+    CLocaleScope locale;
+    return std::snprintf(buffer, size, format, value);
+}
+
 int ScanCatalogueData(const char* line, const char* end, char* classText, double* magnitude,
     double* x, double* y, double* z)
 {

@@ -1,6 +1,9 @@
 // Reading numbers from catalogue text exactly as the C library's "%lf" conversion does, in
-// the "C" locale whatever locale the program runs in, with a fast path for plain decimals.
+// the "C" locale whatever locale the program runs in, with a fast path for plain decimals; and
+// writing them back the same way.
 #pragma once
+
+#include <cstddef>
 
 // Whitespace as the "C" locale's isspace sees it.
 inline bool IsCSpace(char c)
@@ -13,6 +16,11 @@ inline bool IsCSpace(char c)
 // false when no number is there, leaving *value untouched; otherwise stores it and, when
 // next is given, where the number ended.
 bool ScanDouble(const char* text, double* value, const char** next = nullptr);
+
+// snprintf(buffer, size, format, value) in the "C" locale: a decimal point, never a comma,
+// whatever the user's locale, so that what is written reads back with ScanDouble. format holds
+// one conversion of a double.
+int FormatDouble(char* buffer, size_t size, const char* format, double value);
 
 // The fields of a catalogue data line, as sscanf(line, "%s %lf %lf %lf %lf") would fill them.
 // classText must hold 501 bytes; line is NUL-terminated or ends at end, whichever comes first,

@@ -6,6 +6,7 @@
 #include "core/MessageCodes.h"
 #include "widgets/IToggleButton.h"
 #include "widgets/InfoView.h"
+#include "widgets/WidgetGeometry.h"
 
 #include <QCloseEvent>
 #include <QWindowStateChangeEvent>
@@ -25,10 +26,7 @@ UniverseWindow::UniverseWindow(BPoint where, float width, float height, const ch
     const float w = float(this->width()), h = float(this->height());
     mainView = new QWidget(this);
     mainView->setObjectName("mainview");
-    mainView->setAutoFillBackground(true);
-    QPalette grey = mainView->palette();
-    grey.setColor(QPalette::Window, QColor(220, 220, 220));
-    mainView->setPalette(grey);
+    PaintWindowGrey(mainView);
     mainView->setGeometry(0, 0, int(w), int(h));
 
     systemName = new InfoView(BRect(0, h - 12, w - 13, h - 1), "SystemName", "", mainView);

@@ -8,6 +8,7 @@
 #include "controls/SliderControl.h"
 #include "controls/TrackballControl.h"
 #include "core/MessageCodes.h"
+#include "query/panels/FindWindow.h"
 #include "widgets/IPictureButton.h"
 #include "widgets/InfoView.h"
 
@@ -82,7 +83,19 @@ ControlWindow::~ControlWindow()
     // The charts go first: they draw the universe until their threads have stopped.
     for (const QPointer<UniverseWindow>& window : universeWindows)
         delete window.data();
+    for (const QPointer<QWidget>& window : fOtherWindows)
+        delete window.data();
     delete universe;
+}
+
+QList<QWidget*> ControlWindow::OtherWindows() const
+{
+    QList<QWidget*> open;
+    for (const QPointer<QWidget>& window : fOtherWindows) {
+        if (window)
+            open.append(window.data());
+    }
+    return open;
 }
 
 UniverseWindow* ControlWindow::OpenUniverseWindow()
@@ -122,6 +135,11 @@ void ControlWindow::MessageReceived(Message* message)
             LinkControls(window);
         break;
     }
+    case kNewFindWindow:
+        fOtherWindows.removeAll(nullptr);
+        fOtherWindows.append(
+            new FindWindow(BPoint(170, 140), 394, 370, "Find Star", infoView, universe));
+        break;
     case kUniverseWindowActivated: {
         // Only a chart of ours: the pointer is checked against the list before it is used.
         auto* window = static_cast<UniverseWindow*>(message->FindPointer(kUWPointerString));
@@ -139,7 +157,7 @@ void ControlWindow::MessageReceived(Message* message)
         break;
     }
     default:
-        // The star information, H-R diagram, find and list windows arrive with their own work.
+        // The star information, H-R diagram and list windows arrive with their own work.
         break;
     }
 }

@@ -21,7 +21,7 @@ public:
     // Reads "stars.dat" beside the program, opens the first chart and shows itself. The
     // application, a handler, hears B_QUIT_REQUESTED when this window closes.
     ControlWindow(BPoint where, const char* title, QObject* application = nullptr);
-    // Closes the charts still open, then frees the universe.
+    // Closes the charts and other windows still open, then frees the universe.
     ~ControlWindow() override;
 
     // Links the five controls to the chart of window, or unlinks them for null.
@@ -33,6 +33,8 @@ public:
     // The open chart windows, in order of opening.
     const QList<QPointer<UniverseWindow>>& UniverseWindows() const { return universeWindows; }
     UniverseWindow* LinkedWindow() const { return fLinked; }
+    // The other windows opened from here and still open (find windows, so far), oldest first.
+    QList<QWidget*> OtherWindows() const;
 
     TrackballControl* trackball;
     TrackballControl* cameraZ;
@@ -53,4 +55,7 @@ private:
     InfoView* infoView; // a child
     QPointer<UniverseWindow> fLinked; // the chart the controls act on
     QPointer<QObject> fApplication; // not owned
+    // Windows on the universe besides the charts: each deletes itself when closed; those still
+    // open go before the universe does.
+    QList<QPointer<QWidget>> fOtherWindows;
 };

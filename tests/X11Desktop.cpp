@@ -128,6 +128,31 @@ QRect ClientArea(unsigned long window)
     return QRect(x, y, attributes.width, attributes.height);
 }
 
+QRect FrameArea(unsigned long window)
+{
+    const QRect client = ClientArea(window);
+    Connection connection;
+    Display* display = connection.display();
+    if (!display || client.isEmpty())
+        return client;
+    Atom type = None;
+    int format = 0;
+    unsigned long count = 0, left = 0;
+    unsigned char* data = nullptr;
+    XGetWindowProperty(display, window, XInternAtom(display, "_NET_FRAME_EXTENTS", False), 0, 4,
+        False, XA_CARDINAL, &type, &format, &count, &left, &data);
+    QRect frame = client;
+    if (type == XA_CARDINAL && format == 32 && count == 4 && !connection.Failed()) {
+        // Left, right, top, bottom; Xlib hands 32-bit items over as longs.
+        const auto* extents = reinterpret_cast<const long*>(data);
+        frame
+            = client.adjusted(-int(extents[0]), -int(extents[2]), int(extents[1]), int(extents[3]));
+    }
+    if (data)
+        XFree(data);
+    return frame;
+}
+
 void AskToClose(unsigned long window)
 {
     Connection connection;

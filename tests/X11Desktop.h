@@ -31,6 +31,10 @@ bool WindowManagerRunning();
 // screen, in root coordinates; empty when there is no such window.
 QRect ClientArea(unsigned long window);
 
+// Where window stands on the screen with the frame a window manager has put around it (the
+// client area grown by the window's _NET_FRAME_EXTENTS); the client area alone when it has none.
+QRect FrameArea(unsigned long window);
+
 // Sends WM_DELETE_WINDOW to window, as a window manager's close button does.
 void AskToClose(unsigned long window);
 

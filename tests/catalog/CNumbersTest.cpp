@@ -161,3 +161,24 @@ TEST(CNumbers, ScanDoubleLikePercentLf)
     EXPECT_FALSE(ScanDouble("+", &v));
     EXPECT_EQ(v, -1);
 }
+
+TEST(CNumbers, FormatDoubleWritesWhatScanDoubleReadsBack)
+{
+    char text[32];
+    EXPECT_EQ(FormatDouble(text, sizeof text, "%.1f", 4.83), 3);
+    EXPECT_STREQ(text, "4.8");
+    FormatDouble(text, sizeof text, "%+.0f", -0.0);
+    EXPECT_STREQ(text, "-0");
+    FormatDouble(text, sizeof text, "%+.0f", 9.0);
+    EXPECT_STREQ(text, "+9");
+    for (const double value : { -16.716, 0.05, 1234.5678, -1e-7 }) {
+        FormatDouble(text, sizeof text, "%.17g", value);
+        double back = 0;
+        ASSERT_TRUE(ScanDouble(text, &back)) << text;
+        EXPECT_EQ(back, value) << text;
+    }
+    // Cut to the buffer, as snprintf does, and the whole length told.
+    char small[4];
+    EXPECT_EQ(FormatDouble(small, sizeof small, "%.3f", 12.5), 6);
+    EXPECT_STREQ(small, "12.");
+}

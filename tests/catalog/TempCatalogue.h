@@ -1,6 +1,8 @@
 // A catalogue file written by a test and removed when the test ends.
 #pragma once
 
+#include "platform/ExecutablePath.h"
+
 #include <filesystem>
 #include <fstream>
 #include <string>
@@ -27,4 +29,20 @@ public:
 private:
     static inline int sCounter = 0;
     std::filesystem::path fPath;
+};
+
+// "stars.dat" beside the test program, as the program has it beside itself; removed when the
+// object goes.
+class CatalogueBesideProgram {
+public:
+    explicit CatalogueBesideProgram(const std::string& text)
+    {
+        std::ofstream out(Path(), std::ios::binary);
+        out << text;
+    }
+    ~CatalogueBesideProgram() { std::filesystem::remove(Path()); }
+    CatalogueBesideProgram(const CatalogueBesideProgram&) = delete;
+    CatalogueBesideProgram& operator=(const CatalogueBesideProgram&) = delete;
+
+    static std::filesystem::path Path() { return ExecutableDirectory() / "stars.dat"; }
 };

@@ -24,15 +24,6 @@ class ControlWindowTest : public ::testing::Test {
 protected:
     static void SetUpTestSuite() { InitResources(); }
 
-    void SetUp() override
-    {
-        // "stars.dat" beside the test program, as the program has it beside itself.
-        fCatalogue = std::make_unique<TempCatalogue>(
-            "The Sun\nG2V 4.83 0 0 0\nSirius\nA0 1.45 -0.49 -0.76 2.48\n", ExecutableDirectory());
-        std::filesystem::rename(fCatalogue->Path(), ExecutableDirectory() / "stars.dat");
-    }
-    void TearDown() override { std::filesystem::remove(ExecutableDirectory() / "stars.dat"); }
-
     static UniverseView* ViewOf(UniverseWindow* window) { return window->View(); }
 
     static bool LinkedTo(ControlWindow& controls, UniverseView* view)
@@ -47,7 +38,9 @@ protected:
     }
 
     ScopedSpectralTables fTables;
-    std::unique_ptr<TempCatalogue> fCatalogue;
+    CatalogueBesideProgram fCatalogue {
+        "The Sun\nG2V 4.83 0 0 0\nSirius\nA0 1.45 -0.49 -0.76 2.48\n"
+    };
 };
 
 } // namespace
