@@ -1,7 +1,6 @@
 // The six queries and the mask operators over a universe of a million systems, each system
 // with one or two named stars; one core.
-#include "catalog/Star.h"
-#include "catalog/Universe.h"
+#include "bench/MillionSystems.h"
 #include "query/DECQuery.h"
 #include "query/DistanceQuery.h"
 #include "query/MGQuery.h"
@@ -12,41 +11,7 @@
 
 #include <benchmark/benchmark.h>
 
-#include <cstdio>
-#include <memory>
-#include <random>
-
 namespace {
-
-// Radius of a dense generated universe of just over a million systems (pi r^3 / 10).
-constexpr double kRadius = 147.11;
-
-// The generated universe, given stars: about one system in eight a pair, names like the
-// catalogue's, classes and magnitudes spread over the usual range.
-Universe& MillionSystems()
-{
-    static std::unique_ptr<Universe> universe = [] {
-        auto u = std::make_unique<Universe>(
-            kRadius, kDenseDensity, 5000, Random(20261121, 4096, 150889, 714025));
-        static const char* kClasses[]
-            = { "O9V", "B2IV", "A0V", "F5V", "G2V", "K1III", "M4Ve", "K5", "B9.5V", "G8III" };
-        std::mt19937 random(7);
-        char name[32];
-        const int32_t count = u->CountItems();
-        for (int32_t i = 0; i < count; i++) {
-            StarSystem* system = u->SystemAt(i);
-            const int32_t stars = random() % 8 == 0 ? 2 : 1;
-            for (int32_t s = 0; s < stars; s++) {
-                std::snprintf(name, sizeof name, "HIP %d%s", 100000 + i, s ? " B" : "");
-                const double magnitude = static_cast<int32_t>(random() % 2100) * 0.01 - 5;
-                system->AddItem(new Star(name, kClasses[random() % 10], magnitude, 1));
-            }
-            system->SetName(system->StarAt(0)->GetName());
-        }
-        return u;
-    }();
-    return *universe;
-}
 
 void RunQuery(benchmark::State& state, StarSysQuery& query, void* param)
 {

@@ -1,6 +1,8 @@
 // The name tests. Without regard to case, both the search text and each name are lower-cased
-// with the C library's tolower into the two buffers made once with the query, so a run over a
-// million systems allocates nothing.
+// into the two buffers made once with the query, so a run over a million systems allocates
+// nothing. The lower case of a byte is the C library's tolower, asked once a run for each of
+// the 256 byte values (so it follows the locale in force) and looked up in a table after that:
+// a call of tolower for every byte of every name took a third of a run's time.
 #include "query/StarNameQuery.h"
 
 #include "catalog/Universe.h"
@@ -12,12 +14,12 @@
 
 namespace {
 
-// Copies text, its NUL included, lower-cased into buffer.
-void LowerCopy(char* buffer, const char* text)
+// Copies text, its NUL included, lower-cased through lower into buffer.
+void LowerCopy(char* buffer, const char* text, const unsigned char* lower)
 {
     for (int32_t i = 0;; i++) {
         const char c = text[i];
-        buffer[i] = static_cast<char>(std::tolower(static_cast<unsigned char>(c)));
+        buffer[i] = static_cast<char>(lower[static_cast<unsigned char>(c)]);
         if (c == '\0')
             return;
     }
@@ -35,12 +37,19 @@ StarNameQuery::StarNameQuery(Universe* universe)
 {
     nameBuffer[0] = '\0';
     patternBuffer[0] = '\0';
+    FillLowerTable();
 }
 
 StarNameQuery::~StarNameQuery()
 {
     std::free(nameBuffer);
     std::free(patternBuffer);
+}
+
+void StarNameQuery::FillLowerTable()
+{
+    for (int32_t c = 0; c < 256; c++)
+        lower[c] = static_cast<unsigned char>(std::tolower(c));
 }
 
 int32_t StarNameQuery::GetSysMask(StarSysMask* mask, void* param)
@@ -51,7 +60,8 @@ int32_t StarNameQuery::GetSysMask(StarSysMask* mask, void* param)
     if (p->caseSensitive) {
         pattern = p->text;
     } else {
-        LowerCopy(patternBuffer, p->text);
+        FillLowerTable();
+        LowerCopy(patternBuffer, p->text, lower);
         pattern = patternBuffer;
     }
     return StarSysQuery::GetSysMask(mask, param);
@@ -70,7 +80,7 @@ bool StarNameQuery::Query(int32_t index, void* param)
         if (p->caseSensitive) {
             candidate = name;
         } else {
-            LowerCopy(nameBuffer, name);
+            LowerCopy(nameBuffer, name, lower);
             candidate = nameBuffer;
         }
         bool match;

@@ -42,4 +42,8 @@ private:
     bool Is() const;
     bool Contains() const;
     bool StartsWith() const;
+    void FillLowerTable(); // asks tolower, in the locale in force now, for every byte value
+
+    unsigned char lower[256]; // tolower of every byte value: made with the query, and again by
+                              // each run without regard to case
 };
