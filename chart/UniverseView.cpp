@@ -152,14 +152,12 @@ QImage UniverseView::FrontImage() const
 
 void UniverseView::dragEnterEvent(QDragEnterEvent* event)
 {
-    if (DraggedMessage(event->mimeData()))
-        event->acceptProposedAction();
+    AcceptMessageDrag(event);
 }
 
 void UniverseView::dragMoveEvent(QDragMoveEvent* event)
 {
-    if (DraggedMessage(event->mimeData()))
-        event->acceptProposedAction();
+    AcceptMessageDrag(event);
 }
 
 void UniverseView::dropEvent(QDropEvent* event)

@@ -8,6 +8,7 @@
 #include "controls/SliderControl.h"
 #include "controls/TrackballControl.h"
 #include "core/MessageCodes.h"
+#include "lists/ListWindow.h"
 #include "query/panels/FindWindow.h"
 #include "widgets/IPictureButton.h"
 #include "widgets/InfoView.h"
@@ -140,6 +141,11 @@ void ControlWindow::MessageReceived(Message* message)
         fOtherWindows.append(
             new FindWindow(BPoint(170, 140), 394, 370, "Find Star", infoView, universe));
         break;
+    case kNewListWindow:
+        fOtherWindows.removeAll(nullptr);
+        fOtherWindows.append(
+            new ListWindow(BPoint(140, 140), 230, 340, "Star List", infoView, universe));
+        break;
     case kUniverseWindowActivated: {
         // Only a chart of ours: the pointer is checked against the list before it is used.
         auto* window = static_cast<UniverseWindow*>(message->FindPointer(kUWPointerString));
@@ -157,7 +163,7 @@ void ControlWindow::MessageReceived(Message* message)
         break;
     }
     default:
-        // The star information, H-R diagram and list windows arrive with their own work.
+        // The star information and H-R diagram windows arrive with their own work.
         break;
     }
 }

@@ -85,6 +85,12 @@ const Message* DraggedMessage(const QMimeData* data)
     return ours ? &ours->GetMessage() : nullptr;
 }
 
+void AcceptMessageDrag(QDragMoveEvent* event)
+{
+    if (DraggedMessage(event->mimeData()))
+        event->acceptProposedAction();
+}
+
 bool TakeDroppedMessage(QDropEvent* event, QWidget* receiver, Message* message)
 {
     const Message* dragged = DraggedMessage(event->mimeData());

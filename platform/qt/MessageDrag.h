@@ -10,6 +10,7 @@
 #include <QMimeData>
 
 class QDrag;
+class QDragMoveEvent;
 class QDropEvent;
 class QWidget;
 class RBitmap8;
@@ -37,6 +38,10 @@ Qt::DropAction DragMessage(
 
 // The message a drag carries; null for anything else (files, text, other programs' data).
 const Message* DraggedMessage(const QMimeData* data);
+
+// Lets a drag that carries a message (any message) be dropped here, and refuses anything else.
+// For drag-enter and drag-move events alike.
+void AcceptMessageDrag(QDragMoveEvent* event);
 
 // The dropped message, marked as dropped at the drop point in screen coordinates; false, and
 // the drop refused, when the event carries anything but a message.

@@ -1,0 +1,257 @@
+// The list window: its pads, count line, check box, list and handle, and the set operations
+// a drop makes.
+#include "lists/ListWindow.h"
+
+#include "core/MessageCodes.h"
+#include "lists/DropPad.h"
+#include "lists/StarDragger.h"
+#include "lists/StarListView.h"
+#include "platform/qt/MessageDrag.h"
+#include "widgets/IButton.h"
+#include "widgets/InfoView.h"
+#include "widgets/WidgetGeometry.h"
+
+#include <QDragEnterEvent>
+#include <QDropEvent>
+#include <cstdio>
+#include <vector>
+
+namespace {
+
+struct PadEntry {
+    const char* name;
+    float x, y, width, height;
+    int32_t picture; // 'Dzon' resource
+    uint32_t tag;
+    const char* help;
+};
+
+constexpr PadEntry kPads[] = {
+    { "Plus", 0, 0, 32, 32, 0, kAddTag, "Drop Pad: Add to list" },
+    { "Equals", 40, 0, 32, 32, 1, kEqualsTag, "Drop Pad: Copy list" },
+    { "Minus", 80, 0, 32, 32, 2, kMinusTag, "Drop Pad: Remove from list" },
+    { "NOT", 2, 34, 32, 16, 3, kNotTag, "Drop Pad: Copy and invert list" },
+    { "AND", 42, 34, 32, 16, 4, kAndTag, "Drop Pad: Logical AND" },
+    { "OR", 82, 34, 32, 16, 5, kOrTag, "Drop Pad: Logical OR" },
+    { "XOR", 122, 34, 32, 16, 6, kXorTag, "Drop Pad: Logical XOR" },
+};
+
+constexpr float kHiddenHeight = 68; // the frame height while the list is switched off
+constexpr float kMinimumHeight = 120, kMaximumHeight = 32000;
+
+} // namespace
+
+ListWindow::ListWindow(BPoint where, float width, float height, const char* title,
+    QObject* infoTarget, Universe* universe)
+    : universe(universe)
+    , systemCount(universe->CountItems())
+    , mask(new StarSysMask(systemCount, false, 0))
+    , count(0)
+    , showList(true)
+    , frameWidth(width)
+    , savedHeight(height)
+{
+    setAttribute(Qt::WA_DeleteOnClose);
+    setWindowTitle(QString::fromUtf8(title));
+    setGeometry(int(where.x), int(where.y), int(frameWidth) + 1, int(height) + 1);
+    SetHeightLimits();
+    setAcceptDrops(true);
+
+    const int w = int(frameWidth) + 1;
+    fMainView = new QWidget(this);
+    fMainView->setObjectName("mainview");
+    PaintWindowGrey(fMainView);
+    fMainView->setGeometry(rect());
+
+    for (const PadEntry& entry : kPads) {
+        auto* pad = new DropPad(BPoint(entry.x, entry.y), entry.width, entry.height, entry.name,
+            entry.picture, this, fMainView);
+        pad->SetTag(kDropTagField, int32_t(entry.tag));
+        pad->ISetTarget(infoTarget);
+        pad->ISetInfo(entry.help);
+    }
+
+    countView = new InfoView(BRect(0, 54, 100, 66), "Count View", "Star Systems: 0", fMainView);
+    countView->ISetTarget(infoTarget);
+    countView->ISetInfo("Star systems in list");
+
+    showListBox = new ICheckBox(BRect(float(w - 1) - 80, 49, float(w - 1), 63), "Show List CB",
+        "Show List", new Message(kShowListChanged), fMainView);
+    showListBox->setChecked(true);
+    showListBox->SetTarget(this);
+    showListBox->ISetTarget(infoTarget);
+    showListBox->ISetInfo("List operations are much faster when list is not shown");
+
+    listView = new StarListView(
+        BRect(0, 71, float(w - 1), float(this->height() - 1)), "The List", mask, fMainView);
+    listView->ISetTarget(infoTarget);
+    listView->ISetInfo("Star List: Drag stars to another view");
+
+    starDragger = new StarDragger(BPoint(frameWidth - 42, 10), "Star Dragger", mask, fMainView);
+    starDragger->ISetTarget(infoTarget);
+    starDragger->ISetInfo("Star List Dragger: Drag to another view");
+    show();
+}
+
+ListWindow::~ListWindow()
+{
+    // The list reads the mask while it goes.
+    delete fMainView;
+    delete mask;
+}
+
+DropPad* ListWindow::Pad(const char* name) const
+{
+    return fMainView->findChild<DropPad*>(QString::fromUtf8(name));
+}
+
+void ListWindow::SetHeightLimits()
+{
+    const int w = int(frameWidth) + 1;
+    if (showList) {
+        setMinimumSize(w, int(kMinimumHeight) + 1);
+        setMaximumSize(w, int(kMaximumHeight) + 1);
+    } else {
+        setFixedSize(w, int(kHiddenHeight) + 1);
+    }
+}
+
+void ListWindow::MessageReceived(Message* message)
+{
+    const bool tagged = message->HasInt32(kDropTagField);
+    const auto tag = uint32_t(message->FindInt32(kDropTagField));
+    switch (message->what) {
+    case kStarArrayMessage: {
+        const auto* set
+            = static_cast<const StarSysMask*>(message->FindPointer(kSystemArrayPtrString));
+        if (!set)
+            return;
+        DropSet(set, tagged, tag);
+        break;
+    }
+    case kStarMessage: {
+        const int32_t index = message->FindInt32(kSystemIndexString);
+        if (index < 0)
+            return;
+        DropSystem(index, tagged, tag);
+        break;
+    }
+    case kShowListChanged:
+        showList = showListBox->isChecked();
+        if (!showList) {
+            savedHeight = float(height() - 1);
+            SetHeightLimits();
+            resize(int(frameWidth) + 1, int(kHiddenHeight) + 1);
+        } else {
+            SetHeightLimits();
+            resize(int(frameWidth) + 1, int(savedHeight) + 1);
+            BuildList();
+        }
+        return;
+    default:
+        return;
+    }
+    count = mask->CountItems(true);
+    char text[64];
+    std::snprintf(text, sizeof text, "Star Systems: %ld", long(count));
+    countView->setText(QString::fromUtf8(text));
+    BuildList();
+}
+
+void ListWindow::DropSet(const StarSysMask* set, bool tagged, uint32_t tag)
+{
+    if (!tagged) {
+        *mask += *set;
+        return;
+    }
+    switch (tag) {
+    case kAddTag:
+        *mask += *set;
+        break;
+    case kEqualsTag:
+        *mask = *set;
+        break;
+    case kMinusTag:
+        *mask -= *set;
+        break;
+    case kNotTag:
+        *mask = *set;
+        ~*mask;
+        break;
+    case kAndTag:
+        *mask &= *set;
+        break;
+    case kOrTag:
+        *mask |= *set;
+        break;
+    case kXorTag:
+        *mask ^= *set;
+        break;
+    default:
+        break;
+    }
+}
+
+void ListWindow::DropSystem(int32_t index, bool tagged, uint32_t tag)
+{
+    // One system follows rules of its own: NOT flips it alone, AND leaves the list be.
+    const bool old = mask->GetStateSafe(index);
+    if (!tagged) {
+        mask->SetStateSafe(index, true);
+        return;
+    }
+    switch (tag) {
+    case kAddTag:
+    case kOrTag:
+        mask->SetStateSafe(index, true);
+        break;
+    case kEqualsTag:
+        mask->SetAll(false);
+        mask->SetStateSafe(index, true);
+        break;
+    case kMinusTag:
+        mask->SetStateSafe(index, false);
+        break;
+    case kNotTag:
+    case kXorTag:
+        mask->SetStateSafe(index, !old);
+        break;
+    default:
+        break;
+    }
+}
+
+void ListWindow::BuildList()
+{
+    if (!showList)
+        return;
+    std::vector<int32_t> indices;
+    for (int32_t i = 0; i < systemCount; i++) {
+        if (mask->GetStateSafe(i) && universe->SystemAt(i))
+            indices.push_back(i);
+    }
+    listView->Model()->SetSystems(universe, std::move(indices));
+}
+
+void ListWindow::resizeEvent(QResizeEvent*)
+{
+    fMainView->setGeometry(rect());
+    listView->setGeometry(0, 71, width(), std::max(0, height() - 71));
+}
+
+void ListWindow::dragEnterEvent(QDragEnterEvent* event)
+{
+    AcceptMessageDrag(event);
+}
+
+void ListWindow::dragMoveEvent(QDragMoveEvent* event)
+{
+    AcceptMessageDrag(event);
+}
+
+void ListWindow::dropEvent(QDropEvent* event)
+{
+    Message message;
+    if (TakeDroppedMessage(event, this, &message))
+        MessageReceived(&message);
+}
