@@ -6,6 +6,7 @@
 // two halves apart: reading the controls and running the query, and making the message, the
 // image and the drag of a result already found.
 #include "bench/MillionSystems.h"
+#include "bench/WidgetBenchMain.h"
 #include "core/MessageCodes.h"
 #include "platform/qt/MessageDrag.h"
 #include "query/panels/DECQueryView.h"
@@ -17,9 +18,7 @@
 #include "query/panels/RAQueryView.h"
 #include "query/panels/SCQueryView.h"
 #include "query/panels/TextControl.h"
-#include "resources/ResourceData.h"
 
-#include <QApplication>
 #include <QDrag>
 #include <QMouseEvent>
 #include <benchmark/benchmark.h>
@@ -188,22 +187,15 @@ void BM_MakeDrag(benchmark::State& state, const Search& search)
 
 int main(int argc, char** argv)
 {
-    if (qEnvironmentVariableIsEmpty("QT_QPA_PLATFORM"))
-        qputenv("QT_QPA_PLATFORM", "offscreen");
-    QApplication application(argc, argv);
-    InitResources();
-    for (const auto& [stage, run] :
-        { std::pair { "BM_Press/", &BM_Press }, std::pair { "BM_PerformQuery/", &BM_PerformQuery },
-            std::pair { "BM_MakeDrag/", &BM_MakeDrag } }) {
-        for (const Search& search : kSearches) {
-            benchmark::RegisterBenchmark((std::string(stage) + search.name).c_str(), run, search)
-                ->Unit(benchmark::kMillisecond);
+    return RunWidgetBenchmarks(argc, argv, [] {
+        for (const auto& [stage, run] : { std::pair { "BM_Press/", &BM_Press },
+                 std::pair { "BM_PerformQuery/", &BM_PerformQuery },
+                 std::pair { "BM_MakeDrag/", &BM_MakeDrag } }) {
+            for (const Search& search : kSearches) {
+                benchmark::RegisterBenchmark(
+                    (std::string(stage) + search.name).c_str(), run, search)
+                    ->Unit(benchmark::kMillisecond);
+            }
         }
-    }
-    benchmark::Initialize(&argc, argv);
-    if (benchmark::ReportUnrecognizedArguments(argc, argv))
-        return 1;
-    benchmark::RunSpecifiedBenchmarks();
-    benchmark::Shutdown();
-    return 0;
+    });
 }

@@ -122,18 +122,20 @@ inline QRect StarArea(QPoint view)
     return QRect(view, QSize(kChartWidth, kChartHeight - 60));
 }
 
-// Pixels of a picture of a chart that show stars: lit, and not the overlay's green or the
-// markers' red.
-inline int StarPixels(const QImage& image)
+// Whether a pixel of a chart shows a star: lit, and not the overlay's green or the markers' red.
+inline bool IsStarPixel(QRgb p)
 {
     const rgb_color g = system_colors()->color_list[55], r = system_colors()->color_list[42];
+    return qGray(p) > 20 && p != qRgb(g.red, g.green, g.blue) && p != qRgb(r.red, r.green, r.blue);
+}
+
+// Pixels of a picture of a chart that show stars.
+inline int StarPixels(const QImage& image)
+{
     int lit = 0;
     for (int y = 0; y < image.height(); y++) {
-        for (int x = 0; x < image.width(); x++) {
-            const QRgb p = image.pixel(x, y);
-            lit += qGray(p) > 20 && p != qRgb(g.red, g.green, g.blue)
-                && p != qRgb(r.red, r.green, r.blue);
-        }
+        for (int x = 0; x < image.width(); x++)
+            lit += IsStarPixel(image.pixel(x, y));
     }
     return lit;
 }
