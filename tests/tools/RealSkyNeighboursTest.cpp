@@ -3,6 +3,7 @@
 #include "NearbyStars.h"
 
 #include "tools/importer/SourceReaders.h"
+#include "tools/importer/SpectralEstimates.h"
 #include "tools/importer/SystemGrouping.h"
 
 #include "catalog/Star.h"
@@ -109,6 +110,50 @@ TEST_F(RealSky, SiriusBIsAWhiteDwarfInSiriussSystem)
     EXPECT_EQ(b->spectralClass.harvardClass, kClassA);
 }
 
+// The white dwarfs whose types hold no Harvard letter ("DQZ", "DZ") carry the main-sequence
+// class of their temperature after a colon, and stand far below the main sequence of that
+// class on the H-R diagram; no white dwarf within 25 parsecs is left without a class.
+TEST_F(RealSky, WhiteDwarfsHaveAClassBelowTheMainSequence)
+{
+    const std::map<std::string, std::string> placed
+        = { { "Procyon B", "DQZ:" }, { "van Maanen's Star", "DZ:" }, { "LAWD 37", "DQ:" },
+              { "Stein 2051 B", "DC:" }, { "EGGR 372", "DQ9P:" }, { "EGGR 45", "DZ11:" },
+              { "EGGR 453", "DZ13:" }, { "EGGR 246", "DQ9:" }, { "EGGR 41", "DQ8:" } };
+    for (const auto& [name, type] : placed) {
+        const StarSystem* s = FindSystem(Sky(), name);
+        ASSERT_NE(s, nullptr) << name;
+        for (int32_t j = 0; j < s->CountItems(); j++) {
+            const Star* star = s->StarAt(j);
+            if (name != star->GetName())
+                continue;
+            const std::string word = star->GetSpectralClassString();
+            EXPECT_EQ(word.rfind(type, 0), 0u) << name << ": " << word;
+            EXPECT_NE(star->spectralClass.harvardClass, kNoClass) << name << ": " << word;
+            const std::string harvard = word.substr(type.size());
+            const auto mainSequence = MagnitudeOfType(harvard + "V");
+            ASSERT_TRUE(mainSequence.has_value()) << name << ": " << word;
+            EXPECT_GT(star->magnitude, *mainSequence + 5) << name << ": " << word;
+        }
+    }
+    int whiteDwarfs = 0;
+    for (int32_t i = 1; i < Sky().CountItems(); i++) {
+        const StarSystem* s = Sky().SystemAt(i);
+        if (Distance(s) > 25)
+            continue;
+        for (int32_t j = 0; j < s->CountItems(); j++) {
+            const Star* star = s->StarAt(j);
+            const std::string word = star->GetSpectralClassString();
+            if (word.size() < 2 || word[0] != 'D'
+                || std::string("ABCOQZXPHEV").find(word[1]) == std::string::npos)
+                continue;
+            whiteDwarfs++;
+            EXPECT_NE(star->spectralClass.harvardClass, kNoClass)
+                << star->GetName() << ": " << word;
+        }
+    }
+    EXPECT_GE(whiteDwarfs, 20);
+}
+
 // The primaries the table names both bare and with the letter A carry the bare name, each
 // once in the sky, in one system with the companion that keeps its letter B; no star is left
 // with the letter A.
@@ -130,6 +175,38 @@ TEST_F(RealSky, PrimariesCarryTheirBareNames)
         ASSERT_NE(system, nullptr) << name;
         EXPECT_EQ(system, FindSystem(Sky(), name + " B")) << name;
     }
+}
+
+// Companions that share their system's designation carry the letters the table gives them:
+// 40 Eridani's white dwarf is B and its red dwarf C beside Keid, not A and B; mu Herculis'
+// red dwarfs B and C beside its lettered Aa and Ab.
+TEST_F(RealSky, CompanionsCarryTheirOwnLetters)
+{
+    const StarSystem* keid = FindSystem(Sky(), "Keid");
+    ASSERT_NE(keid, nullptr);
+    EXPECT_NEAR(Distance(keid), 5.01, 0.01);
+    ASSERT_EQ(keid->CountItems(), 3);
+    EXPECT_STREQ(keid->StarAt(0)->GetName(), "Keid");
+    const std::map<std::string, std::string> companions
+        = { { "Omicron2 Eridani B", "DA2.9" }, { "Omicron2 Eridani C", "M4.5V" },
+              { "Mu Herculis B", "M3.5V" }, { "Mu Herculis C", "M4K" } };
+    for (const auto& [name, type] : companions) {
+        const StarSystem* s = FindSystem(Sky(), name);
+        ASSERT_NE(s, nullptr) << name;
+        for (int32_t j = 0; j < s->CountItems(); j++) {
+            if (name == s->StarAt(j)->GetName()) {
+                EXPECT_STREQ(s->StarAt(j)->GetSpectralClassString(), type.c_str()) << name;
+            }
+        }
+    }
+    EXPECT_EQ(keid, FindSystem(Sky(), "Omicron2 Eridani B"));
+    EXPECT_EQ(keid, FindSystem(Sky(), "Omicron2 Eridani C"));
+    EXPECT_EQ(FindSystem(Sky(), "Omicron2 Eridani A"), nullptr);
+    EXPECT_EQ(FindSystem(Sky(), "Mu Herculis A"), nullptr);
+    // The white dwarf lies far below the main sequence, the red dwarf on it.
+    EXPECT_GT(keid->StarAt(1)->magnitude, 10);
+    EXPECT_EQ(keid->StarAt(1)->spectralClass.harvardClass, kClassA);
+    EXPECT_EQ(keid->StarAt(2)->spectralClass.harvardClass, kClassM);
 }
 
 TEST_F(RealSky, BrightStarsCarryTheirPublishedTypes)

@@ -1,6 +1,7 @@
 // The Southern Stars tables: reading them, the estimates for rows that lack a value, and
 // bringing them into another catalogue by position and brightness.
 #include "ImporterFixture.h"
+#include "SouthernStarsRows.h"
 
 #include "tools/importer/CatalogueMerge.h"
 #include "tools/importer/Designations.h"
@@ -21,18 +22,8 @@
 
 namespace {
 
-const char* kHeader
-    = "Type,RA,Dec,pmRA,pmDec,V,B,Dist,RV,SpType,Comp,Delta,Sep,PA,Year,T,a,e,i,w,n,"
-      "P,Vtype,Vmin,Vmax,Vper,Vepoch,IDs,Names,\n";
-
-// A row with the columns the reader uses; the others empty.
-std::string Row(const std::string& ra, const std::string& dec, const std::string& v,
-    const std::string& b, const std::string& dist, const std::string& type, const std::string& ids,
-    const std::string& names)
-{
-    return "SS," + ra + "," + dec + ",,," + v + "," + b + "," + dist + ",," + type
-        + ",,,,,,,,,,,,,,,,,," + ids + "," + names + ",\n";
-}
+const char* const kHeader = kSouthernHeader;
+constexpr auto Row = SouthernRow;
 
 std::vector<ImportStar> Read(const std::string& rows, ImportReport* report = nullptr)
 {

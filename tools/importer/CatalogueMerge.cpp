@@ -40,6 +40,38 @@ bool EndsInComponent(const std::string& name)
         && (last.size() == 1 || std::islower(static_cast<unsigned char>(last[1])));
 }
 
+// The names base + " " + letter for components brightest first, each with its own published
+// letter (0 for none); false when there are not enough free letters. A letter another star
+// already carries is passed over: a primary that keeps its bare name ("Sirius") beside a star
+// of the base catalogue of that name has its companion "Sirius B" in the sky already. A star's
+// own letter is kept while it is free, so that the two companions of 40 Eridani, which share
+// "Omicron2 Eridani" beside the primary's common name, are B and C as astronomers call them,
+// not A and B; the others take the free letters in order.
+bool ComponentNames(const std::string& base, const std::vector<char>& own,
+    const std::set<std::string>& taken, std::vector<std::string>* names)
+{
+    names->assign(own.size(), std::string());
+    std::set<std::string> given;
+    for (size_t k = 0; k < own.size(); k++) {
+        if (own[k] < 'A' || own[k] > 'Z')
+            continue;
+        std::string candidate = base + " " + own[k];
+        if (!taken.count(candidate) && given.insert(candidate).second)
+            (*names)[k] = std::move(candidate);
+    }
+    char letter = 'A';
+    for (std::string& name : *names) {
+        while (name.empty()) {
+            if (letter > 'Z')
+                return false;
+            std::string candidate = base + " " + letter++;
+            if (!taken.count(candidate) && given.insert(candidate).second)
+                name = std::move(candidate);
+        }
+    }
+    return true;
+}
+
 } // namespace
 
 double ApparentMagnitude(const ImportStar& star)
@@ -131,6 +163,8 @@ void AnnotateStars(
             report.namesChanged += star.name != label.name;
             star.name = label.name;
             star.nameKind = label.nameKind;
+            // The table's letter for the star goes with the name the table gave it.
+            star.component = label.component;
         }
     }
 }
@@ -170,16 +204,11 @@ int64_t LetterSharedNames(std::vector<ImportStar>& stars)
             while (!base.empty() && (base.back() & 0x80))
                 base.pop_back();
         }
-        // A letter another star already carries is passed over: a primary that keeps its bare
-        // name ("Sirius") beside a star of the base catalogue of that name has its companion
-        // "Sirius B" in the sky already.
+        std::vector<char> own;
+        for (size_t i : members)
+            own.push_back(stars[i].component);
         std::vector<std::string> names;
-        for (char letter = 'A'; letter <= 'Z' && names.size() < members.size(); letter++) {
-            std::string candidate = base + " " + letter;
-            if (!taken.count(candidate))
-                names.push_back(std::move(candidate));
-        }
-        if (names.size() < members.size())
+        if (!ComponentNames(base, own, taken, &names))
             continue;
         for (size_t k = 0; k < members.size(); k++) {
             taken.insert(names[k]);

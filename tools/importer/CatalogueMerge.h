@@ -46,8 +46,10 @@ void AnnotateStars(
 
 // Stars that share one name ("Fomalhaut" for the star and two wide companions, "61 Cygni" for
 // both stars of the pair) and lie within a parsec of the brightest of them get component
-// letters, brightest first: "Fomalhaut A", "B", "C". A letter another star already carries
-// is passed over, so no name is written twice ("Sirius A", "Sirius C" beside "Sirius B").
+// letters, brightest first: "Fomalhaut A", "B", "C". A star whose source gives its own letter
+// (ImportStar::component) takes that one first, while no other star carries it ("Omicron2
+// Eridani B" and "C" for the companions of Keid). A letter another star already carries is
+// passed over, so no name is written twice ("Sirius A", "Sirius C" beside "Sirius B").
 // Names made from the position and names that already end in a component letter are left, and
 // so are stars far apart that share a name and names shared by more stars than there are free
 // letters.

@@ -3,6 +3,7 @@
 #include "tools/importer/CsvTable.h"
 #include "tools/importer/Designations.h"
 #include "tools/importer/SourceReaders.h"
+#include "tools/importer/SpectralEstimates.h"
 #include "tools/importer/StrictNumbers.h"
 
 #include <algorithm>
@@ -14,14 +15,14 @@
 
 namespace {
 
-// The spectral type as the catalogue holds it; an empty type is estimated from the colour
-// index when there is one.
+// The spectral type as the catalogue holds it (a white dwarf's with its Harvard class); an
+// empty type is estimated from the colour index when there is one.
 std::string SpectralWord(
     const std::string& type, std::optional<double> colour, ImportReport& report)
 {
     const std::string word = CleanSpectralClass(type);
     if (!word.empty())
-        return word;
+        return PublishedClass(word, colour, report);
     if (colour) {
         report.classesFromColour++;
         return ClassFromColour(*colour);

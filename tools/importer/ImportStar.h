@@ -33,6 +33,9 @@ struct ImportStar {
     // estimated from the spectral type; only measured stars are matched across catalogues.
     bool measured = true;
     bool classEstimated = false; // the spectral class is not published but estimated
+    // The star's own letter in its multiple system as its source publishes it ('A' to 'Z'), 0
+    // when it gives none; a name the star shares with its companions takes this letter.
+    char component = 0;
 };
 
 // What the importer did with its input: stars read, and the ones left out, by reason.
@@ -45,6 +48,11 @@ struct ImportReport {
     int64_t classesFromMagnitude = 0; // estimated from the absolute magnitude
     int64_t magnitudesFromClass = 0; // absolute magnitude estimated from the spectral type
     int64_t classesAssumed = 0; // neither type, colour nor magnitude: a typical red dwarf
+    // White dwarfs' types the program reads no class in, given the main-sequence class of the
+    // temperature from their temperature index, from their B-V colour, or left as they were.
+    int64_t whiteDwarfsFromIndex = 0;
+    int64_t whiteDwarfsFromColour = 0;
+    int64_t whiteDwarfsUnplaced = 0;
 
     int64_t Skipped() const;
     void Skip(const std::string& reason) { skipped[reason]++; }

@@ -26,6 +26,29 @@ std::string Thousands(int64_t n)
     return n < 0 ? "-" + out : out;
 }
 
+// The white dwarfs' types a source placed on the Harvard scale, as one line of the report
+// after indent; nothing when the source held no such type.
+std::string WhiteDwarfLine(const ImportReport& r, const char* indent)
+{
+    const int64_t placed = r.whiteDwarfsFromIndex + r.whiteDwarfsFromColour;
+    if (placed == 0 && r.whiteDwarfsUnplaced == 0)
+        return "";
+    std::ostringstream out;
+    out << indent;
+    if (placed > 0) {
+        out << "White dwarf types placed on the Harvard scale for " << Thousands(placed)
+            << " stars (from the temperature index for " << Thousands(r.whiteDwarfsFromIndex)
+            << ", the B-V colour for " << Thousands(r.whiteDwarfsFromColour) << ")";
+        if (r.whiteDwarfsUnplaced > 0)
+            out << "; " << Thousands(r.whiteDwarfsUnplaced) << " left without a class";
+    } else {
+        out << "White dwarf types left without a class for " << Thousands(r.whiteDwarfsUnplaced)
+            << " stars (neither a temperature index nor a B-V colour)";
+    }
+    out << ".\n";
+    return out.str();
+}
+
 const char* FormatName(InputFormat format)
 {
     switch (format) {
@@ -250,6 +273,7 @@ std::string DescribeImport(const ImportResult& result)
     if (r.classesFromMagnitude > 0)
         out << "Spectral class estimated from the absolute magnitude for "
             << Thousands(r.classesFromMagnitude) << " stars.\n";
+    out << WhiteDwarfLine(r, "");
     for (const MergeReport& m : result.merges) {
         const ImportReport& read = m.read;
         out << (m.adds ? "Added " : "Annotated with ") << read.source << " (" << read.format
@@ -283,6 +307,7 @@ std::string DescribeImport(const ImportResult& result)
             out << "  Neither magnitude nor usable type for " << Thousands(read.classesAssumed)
                 << " stars, taken for red dwarfs (M, absolute magnitude "
                 << "of an M4 dwarf).\n";
+        out << WhiteDwarfLine(read, "  ");
     }
     if (result.lettered > 0)
         out << "Component letters given to " << Thousands(result.lettered)
@@ -397,7 +422,16 @@ What is written:
   79 characters, control characters made blanks. The spectral type is written as one word
   of at most 7 characters: blanks and characters other than printable ASCII are left out
   and the rest is cut to 7 ("K2 III" is "K2III"). A missing spectral type is estimated from
-  B-V when there is one, else "?". Stars without a positive parallax are skipped and counted.
+  B-V when there is one, else "?". Nightdome reads a star's class from the first of the
+  letters W O B A F G K M R N (either case) in its word. A white dwarf's type (D and one of
+  A B C O Q Z X P H E V) without any of them, such as "DZ", "DQZ" or "DQ9P", is followed by
+  a colon and the main-sequence class of the star's temperature ("DQ9P:G6"), the white
+  dwarf's part cut when the whole would pass 7 characters. The temperature is 50,400 K over
+  the type's temperature index, the number after its letters (DQ9: 5,600 K), else that of a
+  main-sequence star of the star's B-V ("DZ" with B-V 0.55: "DZ:F9"); temperatures and
+  colours become classes by the dwarf sequence of Pecaut & Mamajek (2013). With neither,
+  the type stays as it is and the star has no class.
+  Stars without a positive parallax are skipped and counted.
   An input with no star left to write is an error that says why its stars were skipped.
   Out of range is bad input: declination beyond +-90 degrees, right ascension outside
   0-24 h (kstars, hyg) or 0-360 degrees (csv), a parallax or distance placing a star beyond
@@ -410,8 +444,11 @@ Matching (--add, --annotate):
   close pairs differently). Both give J2000 positions. The closest pairs are taken first,
   each star in one pair at most; names are never compared. Stars of FILE without a V
   magnitude are not matched but added. After merging, stars that share a name and lie
-  within a parsec of the brightest of them get component letters, brightest first
-  ("61 Cygni A", "61 Cygni B"), passing over a letter another star already carries.
+  within a parsec of the brightest of them get component letters: a star of a southern
+  table its own letter of the pair in its Comp column (the first, or the one its GJ
+  number ends in: "BC" on GJ 166B, "AB" on GJ 412B), while no other star carries it
+  ("Omicron2 Eridani B" and "C" beside Keid); the others the free letters brightest
+  first ("61 Cygni A", "61 Cygni B"), passing over a letter another star already carries.
 
 The default sky of the build:
   nightdome-import --format=kstars /usr/share/kstars/stars.dat \

@@ -2,6 +2,7 @@
 #include "core/Constants.h"
 #include "tools/importer/Designations.h"
 #include "tools/importer/SourceReaders.h"
+#include "tools/importer/SpectralEstimates.h"
 #include "tools/importer/StrictNumbers.h"
 
 #include <cmath>
@@ -95,11 +96,14 @@ void ReadKStars(
         star.absoluteMagnitude = CheckedMagnitude(
             magnitude + 5 + 5 * std::log10(parallax / 1000), file, number, "absolute magnitude");
 
+        double bv = 0;
+        const bool coloured = ParseNumber(Field(line, kColour), &bv);
         std::string type = CleanSpectralClass(Field(line, kSpectralType));
-        if (type.empty()) {
-            const std::string colour = Field(line, kColour);
-            double bv = 0;
-            if (ParseNumber(colour, &bv)) {
+        if (!type.empty()) {
+            type
+                = PublishedClass(type, coloured ? std::optional<double>(bv) : std::nullopt, report);
+        } else {
+            if (coloured) {
                 type = ClassFromColour(bv);
                 report.classesFromColour++;
             } else {

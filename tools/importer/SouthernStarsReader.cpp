@@ -8,6 +8,7 @@
 #include "tools/importer/StrictNumbers.h"
 
 #include <algorithm>
+#include <cctype>
 #include <cmath>
 
 namespace {
@@ -105,6 +106,27 @@ void NameFromIds(ImportStar& star, const std::string& names, const std::string& 
             { hd, NameKind::HenryDraper } });
 }
 
+// The star's own component letter, 0 when the row gives none. Comp names the pair the
+// double-star columns measure, mostly with the row's own component first ("BA" on Sirius B,
+// "BC" and "CB" on 40 Eridani B and C); but some companions give the pair as their primary
+// does ("AB" on Lalande 21258 B, "AC" on GJ 667 C). Their Gliese numbers carry their own
+// letters ("GJ 412B", "GJ 667C"), so a letter of the pair that the Gliese number names wins.
+// Lower-case letters name parts of a component ("Aa"): the component is the capital.
+char ComponentLetter(const std::string& comp, const std::vector<std::string>& identifiers)
+{
+    auto isLetter = [](char c) { return c >= 'A' && c <= 'Z'; };
+    if (comp.empty() || !isLetter(comp[0]))
+        return 0;
+    const char second = comp.size() > 1 && isLetter(comp[1]) ? comp[1] : 0;
+    for (const std::string& id : identifiers) {
+        const size_t n = id.size();
+        if (second && id.rfind("GJ ", 0) == 0 && n > 4 && id[n - 1] == second
+            && std::isdigit(static_cast<unsigned char>(id[n - 2])))
+            return second;
+    }
+    return comp[0];
+}
+
 } // namespace
 
 void ReadSouthernStars(
@@ -123,6 +145,7 @@ void ReadSouthernStars(
         type = *rv + 1;
     const auto ids = table.Find({ "ids" });
     const auto names = table.Find({ "names" });
+    const auto comp = table.Find({ "comp" });
 
     while (table.Next()) {
         report.read++;
@@ -145,14 +168,15 @@ void ReadSouthernStars(
         const std::string published = ShortSpectralType(table.Text(type));
         const auto visual = table.OptionalNumber(v, "V");
         const auto blue = table.OptionalNumber(b, "B");
+        const auto colour = visual && blue ? std::optional<double>(*blue - *visual) : std::nullopt;
         if (visual) {
             star.absoluteMagnitude = CheckedMagnitude(
                 CheckedMagnitude(*visual, file, line, "V") + 5 - 5 * std::log10(*distance), file,
                 line, "absolute magnitude");
             if (!published.empty()) {
-                star.spectralClass = published;
-            } else if (blue) {
-                star.spectralClass = ClassFromColour(*blue - *visual);
+                star.spectralClass = PublishedClass(published, colour, report);
+            } else if (colour) {
+                star.spectralClass = ClassFromColour(*colour);
                 star.classEstimated = true;
                 report.classesFromColour++;
             } else {
@@ -166,7 +190,7 @@ void ReadSouthernStars(
             star.measured = false;
             const auto fromType = published.empty() ? std::nullopt : MagnitudeOfType(published);
             if (fromType) {
-                star.spectralClass = published;
+                star.spectralClass = PublishedClass(published, colour, report);
                 star.absoluteMagnitude = *fromType;
                 report.magnitudesFromClass++;
             } else {
@@ -177,6 +201,7 @@ void ReadSouthernStars(
             }
         }
         NameFromIds(star, table.Text(names), table.Text(ids));
+        star.component = ComponentLetter(table.Text(comp), Split(table.Text(ids), ';'));
         stars.push_back(std::move(star));
     }
 }
