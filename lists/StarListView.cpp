@@ -78,10 +78,7 @@ void StarListView::InitiateDrag(int32_t index)
         Message message(kStarMessage);
         message.AddInt32(kSystemIndexString, ListToMaskIndex(index));
         image.LoadFromResource(int32_t(kRaw8Type), 2, 0, 1024);
-        if (fDragStarter)
-            fDragStarter(message, &image, BPoint(1, 1));
-        else
-            DragMessage(this, message, &image, BPoint(1, 1));
+        StartMessageDrag(fDragStarter, this, message, &image, BPoint(1, 1));
         return;
     }
     // The selected rows' systems, found in one walk up the set.
@@ -101,10 +98,7 @@ void StarListView::InitiateDrag(int32_t index)
     Message message(kStarArrayMessage);
     message.AddPointer(kSystemArrayPtrString, dragMask);
     image.LoadFromResource(int32_t(kRaw8Type), 3, 0, 1024);
-    if (fDragStarter)
-        fDragStarter(message, &image, BPoint(1, 1));
-    else
-        DragMessage(this, message, &image, BPoint(1, 1));
+    StartMessageDrag(fDragStarter, this, message, &image, BPoint(1, 1));
 }
 
 void StarListView::MouseMoved(QPoint, Transit transit)

@@ -7,13 +7,13 @@
 #include "platform/BPoint.h"
 #include "platform/BRect.h"
 #include "platform/Message.h"
+#include "platform/qt/MessageDrag.h"
 #include "platform/qt/TransitView.h"
 #include "query/StarSysMask.h"
 #include "widgets/IBroadcaster.h"
 
 #include <QAbstractListModel>
 #include <QListView>
-#include <functional>
 #include <vector>
 
 class RBitmap8;
@@ -55,7 +55,6 @@ public:
     // would be dragged as a set. Called by the mouse handling; public for tests.
     void InitiateDrag(int32_t index);
 
-    using DragStarter = std::function<void(const Message&, RBitmap8*, BPoint)>;
     // Tests catch what a drag would carry instead of running it.
     void SetDragStarter(DragStarter starter) { fDragStarter = std::move(starter); }
 

@@ -79,6 +79,15 @@ Qt::DropAction DragMessage(QWidget* source, const Message& message, RBitmap8* im
     return drag->exec(Qt::CopyAction);
 }
 
+void StartMessageDrag(const DragStarter& starter, QWidget* source, const Message& message,
+    RBitmap8* image, BPoint hotSpot)
+{
+    if (starter)
+        starter(message, image, hotSpot);
+    else
+        DragMessage(source, message, image, hotSpot);
+}
+
 const Message* DraggedMessage(const QMimeData* data)
 {
     const auto* ours = dynamic_cast<const MessageMimeData*>(data);

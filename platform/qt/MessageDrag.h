@@ -8,6 +8,7 @@
 #include "platform/Message.h"
 
 #include <QMimeData>
+#include <functional>
 
 class QDrag;
 class QDragMoveEvent;
@@ -35,6 +36,15 @@ QDrag* MakeMessageDrag(QWidget* source, const Message& message, RBitmap8* image,
 // Builds the drag and runs it until the button is let go; returns what happened to it.
 Qt::DropAction DragMessage(
     QWidget* source, const Message& message, RBitmap8* image, BPoint hotSpot);
+
+// What a view that starts drags may be given instead of running them: it is handed the
+// message, the image and the hot spot. For tests, which cannot let a drag's own event loop
+// wait for a button that is never let go.
+using DragStarter = std::function<void(const Message&, RBitmap8*, BPoint)>;
+
+// Hands the drag to starter when there is one, else runs it as DragMessage does.
+void StartMessageDrag(const DragStarter& starter, QWidget* source, const Message& message,
+    RBitmap8* image, BPoint hotSpot);
 
 // The message a drag carries; null for anything else (files, text, other programs' data).
 const Message* DraggedMessage(const QMimeData* data);

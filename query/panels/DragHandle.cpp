@@ -20,10 +20,7 @@ DragHandle::DragHandle(BRect frame, const char* name, QWidget* parent)
 
 void DragHandle::StartDrag(const Message& message, RBitmap8* image)
 {
-    if (fDragStarter)
-        fDragStarter(message, image, BPoint(1, 1));
-    else
-        DragMessage(this, message, image, BPoint(1, 1));
+    StartMessageDrag(fDragStarter, this, message, image, BPoint(1, 1));
 }
 
 void DragHandle::MouseMoved(QPoint, Transit transit)

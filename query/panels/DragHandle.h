@@ -5,19 +5,17 @@
 #include "platform/BPoint.h"
 #include "platform/BRect.h"
 #include "platform/Message.h"
+#include "platform/qt/MessageDrag.h"
 #include "platform/qt/TransitView.h"
 #include "render/RBitmap8.h"
 #include "widgets/IBroadcaster.h"
 
 #include <QWidget>
-#include <functional>
 #include <memory>
 
 class DragHandle : public TransitView<QWidget>, public IBroadcaster {
 public:
-    // Instead of running a drag, hand its message and image to starter: for tests, which cannot
-    // let a drag's own event loop wait for a button that is never let go.
-    using DragStarter = std::function<void(const Message&, RBitmap8*, BPoint)>;
+    // Tests catch what a drag would carry instead of running it.
     void SetDragStarter(DragStarter starter) { fDragStarter = std::move(starter); }
 
     const RBitmap8* Icon() const { return icon.get(); }

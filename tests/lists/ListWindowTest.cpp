@@ -19,6 +19,7 @@
 #include "resources/ResourceData.h"
 #include "widgets/IButton.h"
 #include "widgets/InfoView.h"
+#include "widgets/WidgetEvents.h"
 
 #include <QDragEnterEvent>
 #include <QDropEvent>
@@ -29,24 +30,6 @@
 #include <optional>
 
 namespace {
-
-// What a drag would have carried.
-struct Caught {
-    Message message;
-    std::vector<uint8_t> pixels;
-};
-
-std::vector<uint8_t> Pixels(const RBitmap8& bitmap)
-{
-    return std::vector<uint8_t>(bitmap.Bits(), bitmap.Bits() + bitmap.BitsLength());
-}
-
-std::vector<uint8_t> Picture(int32_t id)
-{
-    RBitmap8 picture(BRect(0, 0, 31, 31));
-    picture.LoadFromResource(int32_t(kRaw8Type), id, 0, 1024);
-    return Pixels(picture);
-}
 
 class ListTest : public ::testing::Test {
 protected:
@@ -112,12 +95,10 @@ protected:
         return members;
     }
 
-    static std::optional<Caught> PressHandle(DragHandle* handle)
+    static std::optional<CaughtDrag> PressHandle(DragHandle* handle)
     {
-        std::optional<Caught> caught;
-        handle->SetDragStarter([&caught](const Message& m, RBitmap8* image, BPoint) {
-            caught = Caught { m, Pixels(*image) };
-        });
+        std::optional<CaughtDrag> caught;
+        handle->SetDragStarter(CatchDrag(caught));
         QTest::mousePress(handle, Qt::LeftButton, Qt::NoModifier, QPoint(5, 5));
         return caught;
     }
@@ -266,11 +247,11 @@ TEST_F(ListTest, AnEmptyListIsDraggedAndEmptiesAnotherList)
     auto empty = NewList();
     auto other = NewList();
     Drop(other->Pad("Plus"), SetMessage(Set({ 4, 5 })));
-    const std::optional<Caught> drag = PressHandle(empty->starDragger);
+    const std::optional<CaughtDrag> drag = PressHandle(empty->starDragger);
     ASSERT_TRUE(drag.has_value());
     EXPECT_EQ(drag->message.what, kStarArrayMessage);
     EXPECT_EQ(drag->message.FindPointer(kSystemArrayPtrString), empty->Mask());
-    EXPECT_EQ(drag->pixels, Picture(3));
+    EXPECT_EQ(drag->pixels, DragPicture(3));
     Drop(other->Pad("Equals"), drag->message);
     EXPECT_EQ(other->Count(), 0);
     EXPECT_EQ(other->countView->text(), "Star Systems: 0");
@@ -282,11 +263,11 @@ TEST_F(ListTest, AnEmptyListIsDraggedAndEmptiesAnotherList)
 
     // A list of one system is dragged as that system.
     Drop(other->Pad("Plus"), SystemMessage(7));
-    const std::optional<Caught> one = PressHandle(other->starDragger);
+    const std::optional<CaughtDrag> one = PressHandle(other->starDragger);
     ASSERT_TRUE(one.has_value());
     EXPECT_EQ(one->message.what, kStarMessage);
     EXPECT_EQ(one->message.FindInt32(kSystemIndexString), 7);
-    EXPECT_EQ(one->pixels, Picture(2));
+    EXPECT_EQ(one->pixels, DragPicture(2));
 }
 
 TEST_F(ListTest, SwitchingTheListOffAndOn)
@@ -320,10 +301,8 @@ TEST_F(ListTest, DraggingFromTheList)
     auto list = NewList();
     Drop(list->Pad("Plus"), SetMessage(Set({ 2, 5, 8, 11 })));
     StarListView* view = list->listView;
-    std::optional<Caught> caught;
-    view->SetDragStarter([&caught](const Message& m, RBitmap8* image, BPoint) {
-        caught = Caught { m, Pixels(*image) };
-    });
+    std::optional<CaughtDrag> caught;
+    view->SetDragStarter(CatchDrag(caught));
     EXPECT_EQ(view->ListToMaskIndex(0), 2);
     EXPECT_EQ(view->ListToMaskIndex(3), 11);
     EXPECT_EQ(view->ListToMaskIndex(4), -1);
@@ -334,7 +313,7 @@ TEST_F(ListTest, DraggingFromTheList)
     ASSERT_TRUE(caught.has_value());
     EXPECT_EQ(caught->message.what, kStarMessage);
     EXPECT_EQ(caught->message.FindInt32(kSystemIndexString), 5);
-    EXPECT_EQ(caught->pixels, Picture(2));
+    EXPECT_EQ(caught->pixels, DragPicture(2));
     EXPECT_TRUE(view->selectionModel()->isRowSelected(1));
 
     // Two selected, dragged from one of them: both, as a set.
@@ -350,7 +329,7 @@ TEST_F(ListTest, DraggingFromTheList)
     EXPECT_EQ(set->CountItems(true), 2);
     EXPECT_TRUE(set->GetStateSafe(5));
     EXPECT_TRUE(set->GetStateSafe(11));
-    EXPECT_EQ(caught->pixels, Picture(3));
+    EXPECT_EQ(caught->pixels, DragPicture(3));
 
     // Dragged from an unselected row: that row alone.
     caught.reset();

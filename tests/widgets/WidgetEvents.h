@@ -1,6 +1,9 @@
-// The mouse's comings and goings and what a handler heard, for widget tests.
+// The mouse's comings and goings, what a handler heard and what a drag would have carried, for
+// widget tests.
 #pragma once
 
+#include "core/MessageCodes.h"
+#include "platform/qt/MessageDrag.h"
 #include "platform/qt/RecordingHandler.h"
 #include "render/RBitmap8.h"
 
@@ -8,6 +11,7 @@
 #include <QEnterEvent>
 #include <QWidget>
 #include <cstring>
+#include <optional>
 #include <vector>
 
 // The pointer comes over the widget, near its top-left corner.
@@ -38,4 +42,33 @@ inline bool SamePixels(const RBitmap8* a, const RBitmap8* b)
 {
     return a->BitsLength() == b->BitsLength()
         && std::memcmp(a->Bits(), b->Bits(), size_t(a->BitsLength())) == 0;
+}
+
+// A bitmap's pixel memory, to compare pictures.
+inline std::vector<uint8_t> Pixels(const RBitmap8& bitmap)
+{
+    return std::vector<uint8_t>(bitmap.Bits(), bitmap.Bits() + bitmap.BitsLength());
+}
+
+// The pixels of the 32 x 32 drag picture 'Raw8' id: 2 one system, 3 a set.
+inline std::vector<uint8_t> DragPicture(int32_t id)
+{
+    RBitmap8 picture(BRect(0, 0, 31, 31));
+    picture.LoadFromResource(int32_t(kRaw8Type), id, 0, 1024);
+    return Pixels(picture);
+}
+
+// What a drag would have carried: the message, its picture's pixels and the hot spot.
+struct CaughtDrag {
+    Message message;
+    std::vector<uint8_t> pixels;
+    BPoint hotSpot;
+};
+
+// A drag starter that keeps what it is handed in caught (which must outlive its use).
+inline DragStarter CatchDrag(std::optional<CaughtDrag>& caught)
+{
+    return [&caught](const Message& message, RBitmap8* image, BPoint hotSpot) {
+        caught = CaughtDrag { message, Pixels(*image), hotSpot };
+    };
 }

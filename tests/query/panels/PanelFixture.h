@@ -10,6 +10,7 @@
 #include "query/panels/StarQueryView.h"
 #include "render/RBitmap8.h"
 #include "resources/ResourceData.h"
+#include "widgets/WidgetEvents.h"
 
 #include <QCoreApplication>
 #include <QMouseEvent>
@@ -18,41 +19,16 @@
 #include <memory>
 #include <optional>
 
-// What a press of a handle started: the message and a copy of the image, or nothing.
-struct CaughtDrag {
-    Message message;
-    std::unique_ptr<RBitmap8> image;
-    BPoint hotSpot;
-};
-
 // Presses the handle of panel with the left button, catching the drag it would start.
 inline std::optional<CaughtDrag> PressHandle(StarQueryView* panel)
 {
     std::optional<CaughtDrag> caught;
     QueryDragger* handle = panel->Dragger();
-    handle->SetDragStarter([&caught](const Message& message, RBitmap8* image, BPoint hotSpot) {
-        auto copy = std::make_unique<RBitmap8>(BRect(0, 0, 31, 31));
-        std::memcpy(copy->Bits(), image->Bits(), size_t(copy->BitsLength()));
-        caught = CaughtDrag { message, std::move(copy), hotSpot };
-    });
+    handle->SetDragStarter(CatchDrag(caught));
     QMouseEvent press(QEvent::MouseButtonPress, QPointF(5, 5), handle->mapToGlobal(QPointF(5, 5)),
         Qt::LeftButton, Qt::LeftButton, Qt::NoModifier);
     QCoreApplication::sendEvent(handle, &press);
     return caught;
-}
-
-// The 32 x 32 picture of resource 'Raw8' id.
-inline std::unique_ptr<RBitmap8> Picture(int32_t id)
-{
-    auto picture = std::make_unique<RBitmap8>(BRect(0, 0, 31, 31));
-    picture->LoadFromResource(int32_t(kRaw8Type), id, 0, 1024);
-    return picture;
-}
-
-inline bool SamePixels(const RBitmap8& a, const RBitmap8& b)
-{
-    return a.BitsLength() == b.BitsLength()
-        && std::memcmp(a.Bits(), b.Bits(), size_t(a.BitsLength())) == 0;
 }
 
 // A universe of a few systems: the Sun, two single stars and a pair, a nameless system.

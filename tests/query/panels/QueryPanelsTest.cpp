@@ -90,8 +90,8 @@ TEST_F(PanelTest, TheSunByWholeNameDragsOneSystemWithTheSingleSystemPicture)
     ASSERT_TRUE(drag.has_value());
     EXPECT_EQ(drag->message.what, kStarMessage);
     EXPECT_EQ(drag->message.FindInt32(kSystemIndexString), sun);
-    EXPECT_TRUE(SamePixels(*drag->image, *Picture(2)));
-    EXPECT_FALSE(SamePixels(*drag->image, *Picture(3)));
+    EXPECT_EQ(drag->pixels, DragPicture(2));
+    EXPECT_NE(drag->pixels, DragPicture(3));
     EXPECT_EQ(drag->hotSpot.x, 1);
     EXPECT_EQ(drag->hotSpot.y, 1);
     EXPECT_EQ(panel.GetSelectedItems(), 1);
@@ -120,7 +120,7 @@ TEST_F(PanelTest, SeveralSystemsDragTheResultSetWithTheSetPicture)
         EXPECT_EQ(result.GetStateSafe(i), expected) << i;
         EXPECT_EQ(panel.IsSystemSelected(i), expected) << i;
     }
-    EXPECT_TRUE(SamePixels(*drag->image, *Picture(3)));
+    EXPECT_EQ(drag->pixels, DragPicture(3));
     EXPECT_EQ(panel.GetSelectedItems(), 3);
     EXPECT_EQ(panel.FindFirstSystem(), sirius);
     EXPECT_EQ(panel.FindLastSystem(), altair);
@@ -449,7 +449,7 @@ TEST_F(PanelTest, TheHandleSitsAtTheRightEdgeAndExplainsItself)
     EXPECT_LE(handle->geometry().bottom(), panel.height() - 1);
     EXPECT_STREQ(handle->IGetInfo(), "Drag this to another view to find stars");
     EXPECT_EQ(handle->IGetTarget(), &help);
-    EXPECT_TRUE(SamePixels(*handle->Icon(), *Picture(3)));
+    EXPECT_EQ(Pixels(*handle->Icon()), DragPicture(3));
 
     // Over the panel, then the handle (framed), then out of it again.
     QEnterEvent enterPanel(QPointF(2, 2), QPointF(2, 2), QPointF(2, 2));
