@@ -10,7 +10,9 @@ ThreeDNightdomeApp::ThreeDNightdomeApp(int& argc, char** argv)
 {
     if (!QCoreApplication::instance())
         fApplication = std::make_unique<QApplication>(argc, argv);
-    QGuiApplication::setApplicationDisplayName("3D Nightdome");
+    // No display name: Qt would append it to every window's title, and the windows' own titles
+    // ("Star List", "H-R Diagram") are what a window manager has room for.
+    QGuiApplication::setApplicationName("Nightdome");
     QGuiApplication::setDesktopFileName(kAppSignature);
     // Only the control window ends the program (it asks for the quit when it closes). Qt would
     // also quit when the last chart closes: the control window is a tool window, which Qt does
