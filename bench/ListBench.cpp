@@ -19,11 +19,8 @@
 #include "lists/DropPad.h"
 #include "lists/ListWindow.h"
 #include "lists/StarListView.h"
-#include "platform/qt/MessageDrag.h"
 #include "widgets/IButton.h"
 
-#include <QDragEnterEvent>
-#include <QDropEvent>
 #include <memory>
 #include <random>
 #include <string>
@@ -71,17 +68,6 @@ Message SetMessage(const StarSysMask& set)
     Message message(kStarArrayMessage);
     message.AddPointer(kSystemArrayPtrString, const_cast<StarSysMask*>(&set));
     return message;
-}
-
-// Drops message on target as a drag ending there would.
-void Drop(QWidget* target, const Message& message)
-{
-    MessageMimeData data(message);
-    const QPoint middle(target->width() / 2, target->height() / 2);
-    QDragEnterEvent enter(middle, Qt::CopyAction, &data, Qt::LeftButton, Qt::NoModifier);
-    QCoreApplication::sendEvent(target, &enter);
-    QDropEvent drop(QPointF(middle), Qt::CopyAction, &data, Qt::LeftButton, Qt::NoModifier);
-    QCoreApplication::sendEvent(target, &drop);
 }
 
 // Counts the paint events a widget gets.
@@ -152,10 +138,10 @@ void BM_Drop(benchmark::State& state, const Case& c)
     bool painted = true;
     for (auto _ : state) {
         state.PauseTiming();
-        Drop(equals, before);
+        DropMessage(equals, before);
         under.Settle();
         state.ResumeTiming();
-        Drop(target, message);
+        DropMessage(target, message);
         if (c.painted)
             painted = under.Settle() && painted;
     }

@@ -189,6 +189,15 @@ void UniverseView::MessageReceived(Message* message)
         auto* widget = qobject_cast<QWidget*>(handler);
         QObject* looper = widget ? static_cast<QObject*>(widget->window()) : handler;
         renderLock->Acquire();
+        // Subscribers closed since are forgotten here, so that the list does not grow with
+        // every window that once subscribed.
+        for (int32_t i = subscribers.CountItems() - 1; i >= 0; i--) {
+            auto* subscriber = static_cast<SISubscriber*>(subscribers.ItemAtFast(i));
+            if (!subscriber->handler) {
+                subscribers.RemoveItem(i);
+                delete subscriber;
+            }
+        }
         subscribers.AddItem(new SISubscriber(looper, handler, message->FindInt32(kSIFlagsString)));
         renderLock->Release();
         break;

@@ -8,6 +8,7 @@
 #include "controls/SliderControl.h"
 #include "controls/TrackballControl.h"
 #include "core/MessageCodes.h"
+#include "hrd/HRDWindow.h"
 #include "lists/ListWindow.h"
 #include "query/panels/FindWindow.h"
 #include "widgets/IPictureButton.h"
@@ -130,6 +131,11 @@ void ControlWindow::MessageReceived(Message* message)
     switch (message->what) {
     case kNewUniverseWindow: {
         UniverseWindow* window = OpenUniverseWindow();
+        // H-R diagrams follow the selection of every chart, new ones too.
+        for (QWidget* other : OtherWindows()) {
+            if (auto* diagram = dynamic_cast<HRDWindow*>(other))
+                diagram->FollowSelection(window->findChild<UniverseView*>("UniverseView"));
+        }
         // Controls that drive nothing (the last chart closed) take the new chart at once rather
         // than waiting for it to be activated, which a bare X server never does.
         if (!fLinked)
@@ -141,6 +147,19 @@ void ControlWindow::MessageReceived(Message* message)
         fOtherWindows.append(
             new FindWindow(BPoint(170, 140), 394, 370, "Find Star", infoView, universe));
         break;
+    case kNewHRDWindow: {
+        auto* diagram = new HRDWindow(BPoint(150, 150), "H-R Diagram", infoView);
+        fOtherWindows.removeAll(nullptr);
+        fOtherWindows.append(diagram);
+        Message universePointer(kUniversePointer);
+        universePointer.AddPointer(kUniversePtrString, universe);
+        PostMessageToView(diagram, "HRView", universePointer);
+        for (const QPointer<UniverseWindow>& window : universeWindows) {
+            if (window)
+                diagram->FollowSelection(window->findChild<UniverseView*>("UniverseView"));
+        }
+        break;
+    }
     case kNewListWindow:
         fOtherWindows.removeAll(nullptr);
         fOtherWindows.append(
@@ -163,7 +182,7 @@ void ControlWindow::MessageReceived(Message* message)
         break;
     }
     default:
-        // The star information and H-R diagram windows arrive with their own work.
+        // The star information window arrives with its own work.
         break;
     }
 }

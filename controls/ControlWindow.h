@@ -33,8 +33,8 @@ public:
     // The open chart windows, in order of opening.
     const QList<QPointer<UniverseWindow>>& UniverseWindows() const { return universeWindows; }
     UniverseWindow* LinkedWindow() const { return fLinked; }
-    // The other windows opened from here and still open (find and list windows, so far), oldest
-    // first.
+    // The other windows opened from here and still open (find, list and H-R diagram
+    // windows), oldest first.
     QList<QWidget*> OtherWindows() const;
 
     TrackballControl* trackball;

@@ -37,6 +37,15 @@ inline constexpr uint32_t kOrTag = FourCC("ORt ");
 inline constexpr uint32_t kXorTag = FourCC("XORt");
 inline constexpr uint32_t kMinusTag = FourCC("mins");
 
+// Flag bits of a star-information subscription ('SISu' "Flags").
+enum : int32_t {
+    kSITargetChanged = 0x01, // notify when the system under the mouse changes
+    kSISelectionChanged = 0x04, // notify when the selection changes
+    kSIWithTarget = 0x08, // include "Target Index"
+    kSIWithSelection = 0x10, // include "Selection Index"
+    kSIWithUniverse = 0x20, // include "Universe Pointer"
+};
+
 // Query kinds, as each query's QueryType() answers.
 inline constexpr uint32_t kNameQueryType = FourCC("name");
 inline constexpr uint32_t kSpectralClassQueryType = FourCC("SCqy");

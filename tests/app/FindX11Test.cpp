@@ -8,15 +8,12 @@ namespace {
 
 // Where the find window's inside stands and how big it is.
 const QRect kFindArea(170, 140, 395, 371);
-// The name panel in the window's column, and in it the middle of the name field (in the row
-// of controls under the panel's title) and of the drag handle, centred on the same row.
+// The name panel in the window's column, and in it the middle of the name field, in the row of
+// controls under the panel's title where the panel's handle stands too.
 const QPoint kNamePanel(10, 10);
-const QPoint kStarNameField(220, 33);
-const QPoint kHandle(322 + 16, kStarNameField.y());
+const QPoint kStarNameField(220, kPanelRow);
 // Where the find window goes to leave the chart and its read-out in sight.
 const QPoint kAside(600, 140);
-// The middle of the chart's view, well above its read-out.
-const QPoint kDropPoint = kChartOrigin + QPoint(kChartWidth / 2, kChartHeight / 3);
 // The grey of the column behind the panels.
 const QRgb kColumnGrey = qRgb(220, 220, 220);
 // Around the middle of the chart's view, where its origin shows and, once a dropped system has
@@ -108,7 +105,7 @@ protected:
     // Presses the name panel's handle, moves in steps to `to` and lets go there.
     static void DragTheResult(QPoint find, QPoint to)
     {
-        RunXdotool(DragSteps(find + kNamePanel + kHandle, to));
+        RunXdotool(DragSteps(find + kNamePanel + kPanelHandle, to));
     }
 };
 

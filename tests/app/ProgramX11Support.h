@@ -1,163 +1,55 @@
 // What the tests of the real program share: the program started beside a small catalogue under
-// the test's X server, its windows found and worked with xdotool, and what its charts show read
-// off the screen (the origin read-out decoded glyph by glyph with the program's own font, stars
-// counted as lit pixels).
+// the test's X server, where its windows stand and what is in them, its windows found and
+// worked with xdotool, and the gestures that carry sets from window to window.
 #pragma once
 
+#include "ChartReaders.h"
+#include "SmallCatalogue.h"
 #include "X11Desktop.h"
 #include "X11Support.h"
 
 #include "core/MessageCodes.h"
-#include "render/RBMFont8.h"
-#include "render/SystemPalette.h"
 #include "resources/ResourceData.h"
 
+#include <QElapsedTimer>
 #include <QFile>
 #include <QGuiApplication>
 #include <QImage>
 #include <QProcess>
-#include <QScreen>
 #include <QTemporaryDir>
 #include <QTest>
-#include <algorithm>
-#include <cmath>
-#include <cstdio>
 #include <cstdlib>
 #include <functional>
+#include <iterator>
 #include <string>
+#include <utility>
+#include <vector>
 
 // Where the program puts its windows' insides. No window manager moves them: openbox puts its
 // frame around a window where the window asked to stand.
 inline const QRect kControls(90, 60, 320, 45);
 inline const QPoint kChartOrigin(90, 140);
-constexpr int kChartWidth = 329, kChartHeight = 329; // the view, above the 12-pixel strip
+// Where sets are dropped on the chart: the middle of its view, well above the read-out.
+inline const QPoint kDropPoint = kChartOrigin + QPoint(kChartWidth / 2, kChartHeight / 3);
+// Where the pointer rests between gestures: over none of the program's windows.
+inline const QPoint kRestPoint(1250, 1000);
 
-// The screen's own pixels (one GetImage of the root window).
-inline QImage Grab(QRect area)
-{
-    return QGuiApplication::primaryScreen()
-        ->grabWindow(0, area.x(), area.y(), area.width(), area.height())
-        .toImage()
-        .convertToFormat(QImage::Format_RGB32);
-}
+// The find window's distance panel in its column, and in a panel the middle of its handle and
+// of its controls, all in the row under the panel's title.
+inline const QPoint kDistancePanel(10, 310);
+constexpr int kPanelRow = 33;
+inline const QPoint kPanelHandle(322 + 16, kPanelRow);
+inline const QPoint kDistanceMode(10 + 55, kPanelRow);
+inline const QPoint kDistanceField(130 + 20, kPanelRow);
+// The panels' mode menus: "is", "is less than", "is greater than".
+constexpr int kModeCount = 3, kLessThan = 1;
 
-// Reads the four lines of the origin read-out of a chart whose view's top-left is at `view`:
-// each 7 x 14 cell is matched against the program's font, ink being the overlay's green.
-class ReadOutReader {
-public:
-    ReadOutReader()
-        : fResources((InitResources(), true))
-        , fFont(int32_t(kFontType), kSystemFontId, kSystemFontStripWidth, kSystemFontCharHeight,
-              kSystemFontCharWidth, kSystemFontFirstChar, kSystemFontLastChar)
-    {
-        const rgb_color green = system_colors()->color_list[55];
-        fInk = qRgb(green.red, green.green, green.blue);
-    }
-
-    std::string Read(QPoint view) const { return Read(Grab(Area(view)), QPoint(0, 0)); }
-
-    // The same read from a picture of the screen (an xwd dump, say) whose point `at` shows the
-    // top-left of the read-out's area.
-    std::string Read(const QImage& image, QPoint at) const
-    {
-        std::string text;
-        for (int line = 0; line < 4; line++) {
-            std::string row;
-            for (int cell = 0; cell < 38; cell++)
-                row += Decode(image, at.x() + 10 + cell * 7, at.y() + line * 14);
-            while (!row.empty() && row.back() == ' ')
-                row.pop_back();
-            text += row + "\n";
-        }
-        return text;
-    }
-
-    // Where the read-out of the chart whose view's top-left is at `view` stands on the screen.
-    static QRect Area(QPoint view)
-    {
-        const int baseline = static_cast<int>(kChartHeight - 1 - 45.0);
-        return QRect(view.x(), view.y() + baseline - 13, 40 * 7 + 10, 4 * 14);
-    }
-
-private:
-    // The character whose ink is exactly the green of the cell; '?' when none is.
-    char Decode(const QImage& image, int left, int top) const
-    {
-        for (char c = kSystemFontFirstChar; c <= kSystemFontLastChar && c > 0; c++) {
-            const uint8_t* glyph = fFont.GlyphBits(c);
-            bool same = true;
-            for (int y = 0; y < 14 && same; y++) {
-                for (int x = 0; x < 7 && same; x++) {
-                    const bool ink = glyph[y * fFont.StripBytesPerRow() + x] == 255;
-                    same = ink == (image.pixel(left + x, top + y) == fInk);
-                }
-            }
-            if (same)
-                return c;
-        }
-        return '?';
-    }
-
-    bool fResources; // read before the font: the strip comes from them
-    RBMFont8 fFont;
-    QRgb fInk;
-};
-
-// The number after label in the read-out; for "DEC: " the whole angle, minutes included.
-inline double Field(const std::string& text, const std::string& label)
-{
-    const size_t at = text.find(label);
-    if (at == std::string::npos)
-        return -1e9;
-    double value = 0, minutes = 0;
-    const char* p = text.c_str() + at + label.size();
-    if (label == "DEC: " && std::sscanf(p, "%lfd %lf'", &value, &minutes) == 2)
-        return value + (std::signbit(value) ? -minutes : minutes) / 60;
-    return std::atof(p);
-}
-
-// The part of a chart's view above its read-out, where stars are counted.
-inline QRect StarArea(QPoint view)
-{
-    return QRect(view, QSize(kChartWidth, kChartHeight - 60));
-}
-
-// Whether a pixel of a chart shows a star: lit, and not the overlay's green or the markers' red.
-inline bool IsStarPixel(QRgb p)
-{
-    const rgb_color g = system_colors()->color_list[55], r = system_colors()->color_list[42];
-    return qGray(p) > 20 && p != qRgb(g.red, g.green, g.blue) && p != qRgb(r.red, r.green, r.blue);
-}
-
-// Pixels of a picture of a chart that show stars.
-inline int StarPixels(const QImage& image)
-{
-    int lit = 0;
-    for (int y = 0; y < image.height(); y++) {
-        for (int x = 0; x < image.width(); x++)
-            lit += IsStarPixel(image.pixel(x, y));
-    }
-    return lit;
-}
-
-// The same on the screen, in the chart whose view's top-left is at `view`.
-inline int StarPixels(QPoint view)
-{
-    return StarPixels(Grab(StarArea(view)));
-}
-
-// Pixels that differ between two pictures of one area; every pixel when the sizes differ.
-inline int DifferentPixels(const QImage& a, const QImage& b)
-{
-    if (a.size() != b.size())
-        return std::max(a.width() * a.height(), b.width() * b.height());
-    int different = 0;
-    for (int y = 0; y < a.height(); y++) {
-        for (int x = 0; x < a.width(); x++)
-            different += a.pixel(x, y) != b.pixel(x, y);
-    }
-    return different;
-}
+// A list window's drop pads, its handle and its count line.
+inline const QPoint kEqualsPad(40 + 16, 16);
+inline const QPoint kNotPad(2 + 16, 34 + 8);
+inline const QPoint kAndPad(42 + 16, 34 + 8);
+inline const QPoint kStarDragger(188 + 16, 10 + 16);
+inline const QRect kCountLine(0, 54, 101, 13);
 
 // Runs xdotool to its end (no drag of ours runs meanwhile) and returns what it printed.
 inline QString RunXdotool(const QStringList& arguments)
@@ -202,22 +94,13 @@ protected:
             ASSERT_TRUE(fWindowManager.Start()) << "openbox did not take over the screen";
         }
         InitResources();
-        // The program with a small catalogue beside it: the Sun and stars from 3 to 20 pc.
+        // The program with a small catalogue beside it.
         ASSERT_TRUE(fDir.isValid());
         ASSERT_TRUE(QFile::copy(ND_PROGRAM, fDir.filePath("nightdome")));
         QFile::setPermissions(fDir.filePath("nightdome"), QFile::ReadOwner | QFile::ExeOwner);
         QFile catalogue(fDir.filePath("stars.dat"));
         ASSERT_TRUE(catalogue.open(QIODevice::WriteOnly));
-        catalogue.write("The Sun\nG2V 4.83 0 0 0\n"
-                        "Sirius\nA0 1.45 -0.494 -0.759 2.477\n"
-                        "Procyon\nF5 2.68 -1.365 0.320 3.228\n"
-                        "Altair\nA7 2.22 2.54 0.87 -4.31\n"
-                        "Vega\nA0 0.58 1.0 4.9 -5.0\n"
-                        "Fomalhaut\nA3 1.74 7.1 -3.7 -1.1\n"
-                        "Pollux\nK0 1.08 -5.0 3.4 7.9\n"
-                        "Arcturus\nK2 -0.3 -8.8 3.7 -5.9\n"
-                        "Capella\nG8 -0.5 2.0 8.5 10.0\n"
-                        "Far One\nB5 -1.0 15.0 -5.0 8.0\n");
+        catalogue.write(kSmallCatalogue);
         catalogue.close();
         fProgram.setProgram(fDir.filePath("nightdome"));
         fProgram.setProcessChannelMode(QProcess::ForwardedChannels);
@@ -282,6 +165,182 @@ protected:
     {
         const QList<unsigned long> windows = WindowsNamed(name);
         return index < windows.size() ? windows[index] : 0;
+    }
+
+    // The program's windows that are shown: its windows, and a pop-up menu while one is open.
+    QList<unsigned long> ProgramWindows() const
+    {
+        QList<unsigned long> windows;
+        for (const QString& id : RunXdotool(
+                 { "search", "--onlyvisible", "--pid", QString::number(fProgram.processId()) })
+                                     .split('\n', Qt::SkipEmptyParts))
+            windows.append(id.toULong());
+        return windows;
+    }
+
+    // Whether the first chart comes to show the Sun as its origin, as it does when the program
+    // is up; with the read-out it shows instead when it does not.
+    ::testing::AssertionResult StartedAtTheSun()
+    {
+        const std::string text = WaitForReadOut(kChartOrigin,
+            [](const std::string& t) { return t.rfind("Origin: The Sun\n", 0) == 0; });
+        if (text.rfind("Origin: The Sun\n", 0) == 0)
+            return ::testing::AssertionSuccess();
+        return ::testing::AssertionFailure() << "the chart's read-out shows\n" << text;
+    }
+
+    // Clicks control window item `item` and returns the window titled `title` that it opened,
+    // one not in `known`; 0 when none came.
+    static unsigned long Open(int item, const char* title, const QList<unsigned long>& known = {})
+    {
+        RunXdotool(ClickAt(ControlCentre(item)));
+        unsigned long opened = 0;
+        (void)QTest::qWaitFor(
+            [&] {
+                for (unsigned long window : WindowsNamed(title)) {
+                    if (!known.contains(window) && !ClientArea(window).isEmpty()) {
+                        opened = window;
+                        return true;
+                    }
+                }
+                return false;
+            },
+            10000);
+        return opened;
+    }
+
+    // Moves window to `place` and returns where its inside then stands, once it has left where
+    // it stood; under a window manager the frame goes where asked, the inside a little below.
+    static QPoint Move(unsigned long window, QPoint place)
+    {
+        const QPoint from = ClientArea(window).topLeft();
+        RunXdotool({ "windowmove", QString::number(window), Number(place.x()), Number(place.y()) });
+        QPoint at = from;
+        (void)QTest::qWaitFor(
+            [&] {
+                at = ClientArea(window).topLeft();
+                return at != from && (at - place).manhattanLength() < 60;
+            },
+            10000);
+        return at;
+    }
+
+    // Opens the pop-up menu whose field's middle is at `field`, clicks item `index` of its
+    // `count` and waits for it to close; false when no menu came up or it stayed.
+    bool Choose(QPoint field, int index, int count) const
+    {
+        const QList<unsigned long> before = ProgramWindows();
+        RunXdotool(ClickAt(field));
+        unsigned long menu = 0;
+        QRect area;
+        const bool opened = QTest::qWaitFor(
+            [&] {
+                for (unsigned long window : ProgramWindows()) {
+                    if (!before.contains(window)) {
+                        menu = window;
+                        area = ClientArea(window);
+                        return area.height() > count * 8;
+                    }
+                }
+                return false;
+            },
+            5000);
+        if (!opened)
+            return false;
+        // The items are of one height, between a frame a few pixels thick.
+        const QPoint item(
+            area.center().x(), area.top() + area.height() * (2 * index + 1) / (2 * count));
+        RunXdotool(ClickAt(item));
+        return QTest::qWaitFor([&] { return !ProgramWindows().contains(menu); }, 5000);
+    }
+
+    // Sets the find window whose inside stands at `find` to find the systems nearer the Sun
+    // than `distance` parsecs: "is less than" on its distance panel, the distance typed in.
+    bool ChooseNearerThan(QPoint find, double distance) const
+    {
+        if (!Choose(find + kDistancePanel + kDistanceMode, kLessThan, kModeCount))
+            return false;
+        const QPoint field = find + kDistancePanel + kDistanceField;
+        RunXdotool({ "mousemove", Number(field.x()), Number(field.y()), "click", "1", "sleep",
+            "0.2", "key", "ctrl+a", "type", QString::number(distance) });
+        return true;
+    }
+
+    // Drags from `from` to `to` as a hand does, then takes the pointer off every window.
+    static void Drag(QPoint from, QPoint to)
+    {
+        RunXdotool(DragSteps(from, to));
+        RestThePointer();
+    }
+
+    static void RestThePointer()
+    {
+        RunXdotool({ "mousemove", Number(kRestPoint.x()), Number(kRestPoint.y()) });
+    }
+
+    // The chart's stars once its picture differs from `before` and has stayed the same for
+    // half a second.
+    static QImage NewStars(const QImage& before)
+    {
+        return NewPicture(StarArea(kChartOrigin), before);
+    }
+
+    // The chart's stars once its picture has stayed the same for half a second.
+    static QImage SteadyStars() { return NewStars(QImage()); }
+
+    // Stops the chart's steady turn, so that pictures of it taken apart can be laid over each
+    // other: the trackball held still eases the turn away, sample by sample. It is let go once
+    // the picture has stayed the same for a second; false when it never did.
+    static bool StopTheTurn()
+    {
+        const QPoint trackball = ControlCentre(0);
+        RunXdotool({ "mousemove", Number(trackball.x()), Number(trackball.y()), "mousedown", "1" });
+        QImage last;
+        QElapsedTimer unchanged;
+        const bool still = QTest::qWaitFor(
+            [&] {
+                const QImage now = Grab(StarArea(kChartOrigin));
+                if (now != last) {
+                    last = now;
+                    unchanged.start();
+                }
+                return unchanged.elapsed() >= 1000;
+            },
+            15000);
+        RunXdotool({ "mouseup", "1" });
+        RestThePointer();
+        return still;
+    }
+
+    // Whether no two of the windows, frames included, overlap; each pair that does is
+    // reported as a failure.
+    static bool Apart(const std::vector<std::pair<const char*, unsigned long>>& windows)
+    {
+        bool apart = true;
+        for (auto a = windows.begin(); a != windows.end(); ++a) {
+            for (auto b = std::next(a); b != windows.end(); ++b) {
+                if (FrameArea(a->second).intersects(FrameArea(b->second))) {
+                    ADD_FAILURE() << "the " << a->first << " window overlaps the " << b->first
+                                  << " window";
+                    apart = false;
+                }
+            }
+        }
+        return apart;
+    }
+
+    // Saves a picture of the windows, frames included, as `file` in the folder ND_SCREENSHOTS
+    // names; nothing when it names none.
+    static void SaveScreenshot(
+        const std::vector<std::pair<const char*, unsigned long>>& windows, const char* file)
+    {
+        const char* shots = std::getenv("ND_SCREENSHOTS");
+        if (!shots)
+            return;
+        QRect around;
+        for (const auto& window : windows)
+            around |= FrameArea(window.second);
+        EXPECT_TRUE(Grab(around.adjusted(-4, -4, 4, 4)).save(QString(shots) + "/" + file));
     }
 
     WindowManager fWindowManager;
