@@ -16,12 +16,12 @@
 
 #include "catalog/Universe.h"
 #include "chart/SISubscriber.h"
-#include "chart/ThreadPark.h"
 #include "core/Benaphore.h"
 #include "core/SMatrix.h"
 #include "platform/BList.h"
 #include "platform/BPoint.h"
 #include "platform/BRect.h"
+#include "platform/ThreadPark.h"
 #include "platform/TimedLock.h"
 #include "platform/qt/Messaging.h"
 #include "platform/qt/TransitView.h"

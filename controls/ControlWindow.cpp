@@ -9,6 +9,7 @@
 #include "controls/TrackballControl.h"
 #include "core/MessageCodes.h"
 #include "hrd/HRDWindow.h"
+#include "info/StarInfoWindow.h"
 #include "lists/ListWindow.h"
 #include "query/panels/FindWindow.h"
 #include "widgets/IPictureButton.h"
@@ -107,6 +108,17 @@ UniverseWindow* ControlWindow::OpenUniverseWindow()
     return window;
 }
 
+void ControlWindow::KeepOtherWindow(QWidget* window, const char* universeView)
+{
+    fOtherWindows.removeAll(nullptr);
+    fOtherWindows.append(window);
+    if (!universeView)
+        return;
+    Message universePointer(kUniversePointer);
+    universePointer.AddPointer(kUniversePtrString, universe);
+    PostMessageToView(window, universeView, universePointer);
+}
+
 void ControlWindow::LinkControls(UniverseWindow* window)
 {
     UniverseView* view = window ? window->findChild<UniverseView*>("UniverseView") : nullptr;
@@ -143,17 +155,16 @@ void ControlWindow::MessageReceived(Message* message)
         break;
     }
     case kNewFindWindow:
-        fOtherWindows.removeAll(nullptr);
-        fOtherWindows.append(
+        KeepOtherWindow(
             new FindWindow(BPoint(170, 140), 394, 370, "Find Star", infoView, universe));
+        break;
+    case kNewStarInfoWindow:
+        KeepOtherWindow(
+            new StarInfoWindow(BPoint(120, 150), "Star Info", infoView), "Star Info View");
         break;
     case kNewHRDWindow: {
         auto* diagram = new HRDWindow(BPoint(150, 150), "H-R Diagram", infoView);
-        fOtherWindows.removeAll(nullptr);
-        fOtherWindows.append(diagram);
-        Message universePointer(kUniversePointer);
-        universePointer.AddPointer(kUniversePtrString, universe);
-        PostMessageToView(diagram, "HRView", universePointer);
+        KeepOtherWindow(diagram, "HRView");
         for (const QPointer<UniverseWindow>& window : universeWindows) {
             if (window)
                 diagram->FollowSelection(window->findChild<UniverseView*>("UniverseView"));
@@ -161,8 +172,7 @@ void ControlWindow::MessageReceived(Message* message)
         break;
     }
     case kNewListWindow:
-        fOtherWindows.removeAll(nullptr);
-        fOtherWindows.append(
+        KeepOtherWindow(
             new ListWindow(BPoint(140, 140), 230, 340, "Star List", infoView, universe));
         break;
     case kUniverseWindowActivated: {
@@ -182,7 +192,6 @@ void ControlWindow::MessageReceived(Message* message)
         break;
     }
     default:
-        // The star information window arrives with its own work.
         break;
     }
 }

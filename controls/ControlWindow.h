@@ -33,8 +33,8 @@ public:
     // The open chart windows, in order of opening.
     const QList<QPointer<UniverseWindow>>& UniverseWindows() const { return universeWindows; }
     UniverseWindow* LinkedWindow() const { return fLinked; }
-    // The other windows opened from here and still open (find, list and H-R diagram
-    // windows), oldest first.
+    // The other windows opened from here and still open (find, list, H-R diagram and star
+    // information windows), oldest first.
     QList<QWidget*> OtherWindows() const;
 
     TrackballControl* trackball;
@@ -48,6 +48,9 @@ protected:
 
 private:
     UniverseWindow* OpenUniverseWindow();
+    // Keeps window among the other windows and, when universeView names a view of it, posts
+    // the universe to that view.
+    void KeepOtherWindow(QWidget* window, const char* universeView = nullptr);
 
     Universe* universe; // owned
     // Not owned: each chart closes and deletes itself, and tells this window so; a closed one

@@ -61,20 +61,12 @@ protected:
         view->MessageReceived(&message);
     }
 
-    void MoveTo(QPoint where)
-    {
-        QMouseEvent move(QEvent::MouseMove, QPointF(where), view->mapToGlobal(QPointF(where)),
-            Qt::NoButton, Qt::NoButton, Qt::NoModifier);
-        QCoreApplication::sendEvent(view.get(), &move);
-        DeliverPostedMessages();
-    }
+    void MoveTo(QPoint where) { MoveMouse(view.get(), where); }
 
     void PressAt(QPoint where)
     {
         caught.reset();
-        QMouseEvent press(QEvent::MouseButtonPress, QPointF(where),
-            view->mapToGlobal(QPointF(where)), Qt::LeftButton, Qt::LeftButton, Qt::NoModifier);
-        QCoreApplication::sendEvent(view.get(), &press);
+        PressMouse(view.get(), where);
     }
 
     // Where the marker of star number star of system index is centred.

@@ -3,6 +3,7 @@
 #include "chart/ChartFixture.h"
 
 #include "controls/ControlWindow.h"
+#include "controls/ControlsOnTwoStars.h"
 #include "core/MessageCodes.h"
 #include "hrd/HRDView.h"
 #include "hrd/HRDWindow.h"
@@ -152,18 +153,11 @@ TEST_F(HRDWindowTest, SelectingOnAFollowedChartPlotsTheSelection)
 
 TEST(HRDFromControlWindow, TheButtonOpensADiagramThatFollowsEveryChart)
 {
-    InitResources();
-    ScopedSpectralTables tables;
-    CatalogueBesideProgram catalogue("The Sun\nG2V 4.83 0 0 0\nSirius\nA0 1.45 -0.49 -0.76 2.48\n");
-    ControlWindow controls(BPoint(90, 60), "3D Nightdome");
-    auto* button = controls.findChild<QWidget*>("Show H-R Window Button");
-    ASSERT_NE(button, nullptr);
-    QTest::mouseClick(button, Qt::LeftButton, Qt::NoModifier, QPoint(16, 16));
-    DeliverPostedMessages(); // the button's command, which posts the universe to the view
-    DeliverPostedMessages();
-    ASSERT_EQ(controls.OtherWindows().size(), 1);
-    auto* window = dynamic_cast<HRDWindow*>(controls.OtherWindows().front());
+    ControlsOnTwoStars program;
+    ControlWindow& controls = program.controls;
+    auto* window = program.Open<HRDWindow>("Show H-R Window Button");
     ASSERT_NE(window, nullptr);
+    EXPECT_EQ(controls.OtherWindows().size(), 1);
     EXPECT_EQ(window->windowTitle(), "H-R Diagram");
     EXPECT_EQ(window->geometry(), QRect(150, 150, 300, 308));
     EXPECT_EQ(window->View()->IGetTarget(), controls.GetInfoView());

@@ -5,6 +5,7 @@
 
 #include "catalog/TempCatalogue.h"
 #include "controls/ControlWindow.h"
+#include "controls/ControlsOnTwoStars.h"
 #include "core/MessageCodes.h"
 #include "lists/DropPad.h"
 #include "lists/ListWindow.h"
@@ -378,19 +379,12 @@ TEST_F(ListTest, PadsLightUpUnderADrag)
 
 TEST(ListFromControlWindow, TheListButtonOpensAStarList)
 {
-    InitResources();
-    ScopedSpectralTables tables;
-    CatalogueBesideProgram catalogue("The Sun\nG2V 4.83 0 0 0\nSirius\nA0 1.45 -0.49 -0.76 2.48\n");
-    ControlWindow controls(BPoint(90, 60), "3D Nightdome");
-    auto* button = controls.findChild<QWidget*>("New List Window Button");
-    ASSERT_NE(button, nullptr);
-    QTest::mouseClick(button, Qt::LeftButton, Qt::NoModifier, QPoint(16, 16));
-    DeliverPostedMessages();
-    ASSERT_EQ(controls.OtherWindows().size(), 1);
-    auto* list = dynamic_cast<ListWindow*>(controls.OtherWindows().front());
+    ControlsOnTwoStars program;
+    auto* list = program.Open<ListWindow>("New List Window Button");
     ASSERT_NE(list, nullptr);
+    EXPECT_EQ(program.controls.OtherWindows().size(), 1);
     EXPECT_EQ(list->windowTitle(), "Star List");
     EXPECT_EQ(list->geometry(), QRect(140, 140, 231, 341));
     EXPECT_EQ(list->systemCount, 2);
-    EXPECT_EQ(list->Pad("Plus")->IGetTarget(), controls.GetInfoView());
+    EXPECT_EQ(list->Pad("Plus")->IGetTarget(), program.controls.GetInfoView());
 }

@@ -9,6 +9,7 @@
 
 #include <QCoreApplication>
 #include <QEnterEvent>
+#include <QMouseEvent>
 #include <QWidget>
 #include <cstring>
 #include <optional>
@@ -20,6 +21,23 @@ inline void Enter(QWidget* widget)
     QEnterEvent event(
         QPointF(2, 2), widget->mapToGlobal(QPointF(2, 2)), widget->mapToGlobal(QPointF(2, 2)));
     QCoreApplication::sendEvent(widget, &event);
+}
+
+// The pointer moves to where in the widget, no button held; what that posts is delivered.
+inline void MoveMouse(QWidget* widget, QPoint where)
+{
+    QMouseEvent move(QEvent::MouseMove, QPointF(where), widget->mapToGlobal(QPointF(where)),
+        Qt::NoButton, Qt::NoButton, Qt::NoModifier);
+    QCoreApplication::sendEvent(widget, &move);
+    DeliverPostedMessages();
+}
+
+// The left button goes down at where in the widget.
+inline void PressMouse(QWidget* widget, QPoint where)
+{
+    QMouseEvent press(QEvent::MouseButtonPress, QPointF(where), widget->mapToGlobal(QPointF(where)),
+        Qt::LeftButton, Qt::LeftButton, Qt::NoModifier);
+    QCoreApplication::sendEvent(widget, &press);
 }
 
 // The pointer leaves the widget.

@@ -1,5 +1,6 @@
-// Where a render worker waits between frames. A resume that comes before the worker parks is
-// remembered (once), so a worker never misses its next frame.
+// Where a worker thread waits until it is given more to do (a render worker between frames, the
+// terminal thread while idle). A resume that comes before the thread parks is remembered (once),
+// so a thread never misses the work it is resumed for.
 #pragma once
 
 #include <condition_variable>
