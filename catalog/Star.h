@@ -4,6 +4,15 @@
 #include "catalog/GravSystem.h"
 #include "catalog/SpectralClass.h"
 
+#include <cmath>
+
+// A star's luminosity in Suns from its absolute magnitude: 2.512 to the power of the
+// magnitudes it is brighter than the Sun, whose absolute magnitude is taken as 4.7.
+inline double SolarLuminosity(double absoluteMagnitude)
+{
+    return std::pow(2.512, 4.7 - absoluteMagnitude);
+}
+
 class Star : public GravSystem {
 public:
     Star(const char* name, const char* spectralClassText, double magnitude, int32_t blockSize);

@@ -138,7 +138,7 @@ void ReadCatalogue(std::FILE* file, int32_t maxStars, Universe* universe, size_t
         // A first record at the sentinel position still opens a system of its own.
         if (!system || x != previous.x || y != previous.y || z != previous.z) {
             previous.Set(x, y, z);
-            const double luminosity = std::pow(2.512, 4.7 - magnitude);
+            const double luminosity = SolarLuminosity(magnitude);
             system = new StarSystem(
                 name, previous, luminosity, SpectralTableFor(star->spectralClass.harvardClass), 2);
             universe->AddItem(system);

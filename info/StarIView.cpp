@@ -6,6 +6,7 @@
 #include "catalog/StarSystem.h"
 #include "catalog/Universe.h"
 #include "core/CCoord.h"
+#include "core/Constants.h"
 #include "core/MessageCodes.h"
 #include "render/RBitmap8.h"
 #include "widgets/WidgetGeometry.h"
@@ -29,10 +30,6 @@ constexpr uint8_t kDistanceCol = 12;
 constexpr uint8_t kClassCol = 28;
 constexpr uint8_t kLuminosityCol = 40;
 constexpr uint8_t kMembersShown = 3; // rows each block clears; more members type on below
-
-// The Sun's absolute magnitude as the luminosities take it.
-constexpr double kSunMagnitude = 4.7;
-constexpr double kLightYearsPerParsec = 3.26;
 
 // Types text at (row, col), at most maxLength characters of it.
 void PrintAt(HWTerminal& terminal, int32_t row, uint8_t col, const char* text, int32_t maxLength)
@@ -131,9 +128,7 @@ void StarIView::PrintStar1Block()
         std::snprintf(
             text, sizeof text, "%.1f %s", star->GetMagnitude(), star->GetSpectralClassString());
         PrintAt(*this, row, kClassCol, text, 10);
-        // In Suns: 2.512 to the power of the magnitudes the star is brighter than the Sun.
-        std::snprintf(
-            text, sizeof text, "%f", std::pow(2.512, kSunMagnitude - star->GetMagnitude()));
+        std::snprintf(text, sizeof text, "%f", SolarLuminosity(star->GetMagnitude()));
         PrintAt(*this, row, kLuminosityCol, text, 10);
     }
 }
