@@ -114,7 +114,7 @@ Universe::Universe(int32_t blockSize)
 {
 }
 
-void ReadCatalogue(std::FILE* file, int32_t maxStars, Universe* universe, size_t window)
+bool ReadCatalogue(std::FILE* file, int32_t maxStars, Universe* universe, size_t window)
 {
     CatalogueText text(file, window);
     // The scan targets live across records: a line with fewer fields keeps the values the
@@ -125,7 +125,8 @@ void ReadCatalogue(std::FILE* file, int32_t maxStars, Universe* universe, size_t
     char name[kMaxName + 1];
     StarSystem* system = nullptr;
 
-    for (int32_t records = 0; records < maxStars && text.More(); records++) {
+    int32_t records = 0;
+    for (; records < maxStars && text.More(); records++) {
         const auto [nameLine, nameLength] = text.Line();
         const size_t kept = std::min(nameLength, kMaxName);
         std::memcpy(name, nameLine, kept);
@@ -145,6 +146,7 @@ void ReadCatalogue(std::FILE* file, int32_t maxStars, Universe* universe, size_t
         }
         system->AddItem(star);
     }
+    return records >= maxStars && text.More();
 }
 
 Universe::Universe(const char* fileName, int32_t maxStars, int32_t blockSize)
@@ -164,6 +166,22 @@ Universe::Universe(double radius, stellarDensity density, int32_t blockSize, Ran
     // pi, not 4/3 pi: the count is a density over the generator's cube, not a sphere.
     const auto count = static_cast<int64_t>(
         kPI * radius * radius * radius * static_cast<int32_t>(density) * 0.01);
+    Scatter(count, radius, random);
+}
+
+Universe* Universe::Generate(
+    int32_t count, stellarDensity density, int32_t blockSize, Random random)
+{
+    // The radius at which the constructor above would make count systems.
+    const double radius
+        = std::cbrt(std::max(count, 0) / (kPI * static_cast<int32_t>(density) * 0.01));
+    auto* universe = new Universe(blockSize);
+    universe->Scatter(std::max(count, 0), radius, random);
+    return universe;
+}
+
+void Universe::Scatter(int64_t count, double radius, Random& random)
+{
     for (int64_t i = 0; i < count; i++) {
         const double x = random.Rand(20000) * 0.0001 * radius - radius;
         const double y = random.Rand(20000) * 0.0001 * radius - radius;

@@ -38,12 +38,21 @@ public:
     // the generator's values can be negative.
     Universe(double radius, stellarDensity density, int32_t blockSize, Random random = Random());
 
+    // Exactly count systems as the constructor above makes them, at the density given, in a cube
+    // whose radius is chosen so that the density holds: for demonstrations and measurements.
+    static Universe* Generate(
+        int32_t count, stellarDensity density, int32_t blockSize, Random random = Random());
+
     // Destroys every system and, through them, their stars.
     ~Universe() override;
     Universe(const Universe&) = delete;
     Universe& operator=(const Universe&) = delete;
 
     StarSystem* SystemAt(int32_t index) const { return static_cast<StarSystem*>(ItemAt(index)); }
+
+private:
+    // Appends count unnamed, starless systems at random positions drawn from random.
+    void Scatter(int64_t count, double radius, Random& random);
 };
 
 // The catalogue is read through a window of this many bytes, so a catalogue of a million stars
@@ -52,6 +61,7 @@ inline constexpr size_t kCatalogueWindow = size_t(1) << 20;
 
 // Reads catalogue records from file, from where it stands, and appends their systems to
 // universe, as the file constructor does; at most maxStars records. window is the size of the
-// reading window (tests and fuzzing make it small, to reach its edges often).
-void ReadCatalogue(
+// reading window (tests and fuzzing make it small, to reach its edges often). True when reading
+// stopped at maxStars with more of the file left.
+bool ReadCatalogue(
     std::FILE* file, int32_t maxStars, Universe* universe, size_t window = kCatalogueWindow);

@@ -105,6 +105,13 @@ public:
     // The origin read-out as the overlay shows it now.
     std::string ReadOut();
 
+    // Makes the Sun, the system at (0, 0, 0), the origin as a click on a selected system makes
+    // that system the origin; the camera glides back over the next frames. Without a system
+    // there, the origin goes back to (0, 0, 0) as the chart starts, on system 0.
+    void ReturnOriginToSun();
+    // The system the read-out names as origin.
+    int32_t OriginSystem();
+
     // The nearest drawn system whose pick box holds where, or -1.
     int32_t FindSystem(BPoint where);
     void BroadcastSI(int32_t selection, int32_t target);

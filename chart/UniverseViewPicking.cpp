@@ -124,6 +124,28 @@ void UniverseView::ApplyClick(int32_t t)
     renderLock->Release();
 }
 
+void UniverseView::ReturnOriginToSun()
+{
+    // The positions never change: the search needs no lock, only the origin does.
+    int32_t sun = -1;
+    for (size_t i = 0; i < fPositionX.size() && sun < 0; i++) {
+        if (fPositionX[i] == 0 && fPositionY[i] == 0 && fPositionZ[i] == 0)
+            sun = int32_t(i);
+    }
+    renderLock->Acquire();
+    originOffset.Set(0, 0, 0);
+    originSystem = sun >= 0 ? sun : 0;
+    renderLock->Release();
+}
+
+int32_t UniverseView::OriginSystem()
+{
+    renderLock->Acquire();
+    const int32_t origin = originSystem;
+    renderLock->Release();
+    return origin;
+}
+
 int32_t UniverseView::FindSystem(BPoint where)
 {
     renderLock->Acquire();
@@ -154,7 +176,7 @@ void UniverseView::SetDataString(int32_t selection, int32_t target)
     if (!s && !t) {
         const bool atSun = originOffset.x == 0 && originOffset.y == 0 && originOffset.z == 0;
         help = atSun ? "Click to drag all visible stars to another view"
-                     : "Click to return Origin to the sun";
+                     : "Click to return Origin to the sun  [Home]";
     } else if (!s) {
         AppendSystem(data, sizeof data, t);
         help = "Click star to make Selection or drag to another view";

@@ -54,10 +54,20 @@ UniverseWindow::~UniverseWindow()
     view->DetachedFromWindow();
 }
 
+namespace {
+int32_t gRenderThreadCount = 0; // 0: the processor count
+}
+
 int32_t UniverseWindow::RenderThreadCount()
 {
-    return std::clamp(
-        int32_t(std::thread::hardware_concurrency()), 1, UniverseView::kMaxRenderThreads);
+    const int32_t count = gRenderThreadCount > 0 ? gRenderThreadCount
+                                                 : int32_t(std::thread::hardware_concurrency());
+    return std::clamp(count, 1, UniverseView::kMaxRenderThreads);
+}
+
+void UniverseWindow::SetRenderThreadCount(int32_t count)
+{
+    gRenderThreadCount = count;
 }
 
 void UniverseWindow::resizeEvent(QResizeEvent*)

@@ -25,8 +25,11 @@ public:
     UniverseView* View() const { return view; }
     void MessageReceived(Message* message) override;
 
-    // The processor count, at most 8: the chart's render threads.
+    // The chart's render threads: the count set last, else the processor count, at most 8.
     static int32_t RenderThreadCount();
+    // Charts opened from now on render on count threads (1 to 8); 0 goes back to the processor
+    // count. Called from the GUI thread only.
+    static void SetRenderThreadCount(int32_t count);
 
 protected:
     void showEvent(QShowEvent* event) override;

@@ -4,7 +4,9 @@
 
 #include "chart/UniverseView.h"
 #include "chart/UniverseWindow.h"
+#include "controls/ChartKeys.h"
 #include "controls/MouseControls.h"
+#include "controls/ProgramKeys.h"
 #include "controls/SliderControl.h"
 #include "controls/TrackballControl.h"
 #include "core/MessageCodes.h"
@@ -28,7 +30,7 @@ struct ButtonEntry {
 
 // Left to right after the mouse controls. "Hertzprung" is spelt as the program always has.
 constexpr ButtonEntry kButtons[] = {
-    { "New Nightdome Button", 0, kNewUniverseWindow, "New Nightdome" },
+    { "New Nightdome Button", 0, kNewUniverseWindow, "New Nightdome  [Ctrl+N]" },
     { "Show Info Window Button", 1, kNewStarInfoWindow, "New Star Info window" },
     { "Show H-R Window Button", 2, kNewHRDWindow, "New Hertzprung-Russell Diagram window" },
     { "Show Find Window Button", 3, kNewFindWindow, "Find Star" },
@@ -37,16 +39,15 @@ constexpr ButtonEntry kButtons[] = {
 
 } // namespace
 
-ControlWindow::ControlWindow(BPoint where, const char* title, QObject* application)
-    : fApplication(application)
+ControlWindow::ControlWindow(BPoint where, const char* title, QObject* application, Universe* given)
+    : universe(given ? given : new Universe("stars.dat", 1000000, 5000))
+    , fApplication(application)
 {
     // A small tool window of fixed size that stays above the charts.
     setWindowFlags(Qt::Tool | Qt::WindowStaysOnTopHint);
     setWindowTitle(QString::fromUtf8(title));
     setGeometry(int(where.x), int(where.y), 320, 45);
     setFixedSize(320, 45);
-
-    universe = new Universe("stars.dat", 1000000, 5000);
 
     auto* mainView = new QWidget(this);
     mainView->setObjectName("main view");
@@ -77,6 +78,7 @@ ControlWindow::ControlWindow(BPoint where, const char* title, QObject* applicati
         frame = BRect(frame.left + 32, frame.top, frame.right + 32, frame.bottom);
     }
 
+    new ProgramKeys(this); // the keys of every window; a child
     LinkControls(OpenUniverseWindow());
     show();
 }
@@ -104,6 +106,7 @@ QList<QWidget*> ControlWindow::OtherWindows() const
 UniverseWindow* ControlWindow::OpenUniverseWindow()
 {
     auto* window = new UniverseWindow(BPoint(90, 140), 328, 340, "Nightdome", infoView, universe);
+    new ChartKeys(window->View()); // the chart's own keys; the view owns them
     universeWindows.append(window);
     return window;
 }

@@ -18,9 +18,11 @@ class TrackballControl;
 
 class ControlWindow : public QWidget, public BHandler {
 public:
-    // Reads "stars.dat" beside the program, opens the first chart and shows itself. The
-    // application, a handler, hears B_QUIT_REQUESTED when this window closes.
-    ControlWindow(BPoint where, const char* title, QObject* application = nullptr);
+    // Takes universe (owned) or, when there is none, reads "stars.dat" beside the program; opens
+    // the first chart and shows itself. The application, a handler, hears B_QUIT_REQUESTED when
+    // this window closes.
+    ControlWindow(BPoint where, const char* title, QObject* application = nullptr,
+        Universe* universe = nullptr);
     // Closes the charts and other windows still open, then frees the universe.
     ~ControlWindow() override;
 

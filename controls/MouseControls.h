@@ -31,13 +31,14 @@ enum MouseControlIndex : int32_t {
 };
 
 // The resource numbers do not follow the order of the controls; the brightness help text is
-// spelt as the program has always shown it.
+// spelt as the program has always shown it. A control that a chart's keys stand in for names
+// them after its help, in brackets (see ChartKeys).
 inline constexpr std::array<MouseControlEntry, kMouseControlCount> kMouseControls { {
     { "Track Ball", MouseControlClass::Trackball, 1, Qt::SizeAllCursor, { 0.02, 0.02, 0.25, 0.25 },
-        "Virtual Trackball: Rotate nightdome" },
+        "Virtual Trackball: Rotate nightdome  [arrows]" },
     // Vertical only: nothing linked to its horizontal axis ever changes.
     { "Camera Z", MouseControlClass::Trackball, 2, Qt::SizeVerCursor, { 0.0, -0.3, 0.0, 0.25 },
-        "Camera Distance: Zoom in and out" },
+        "Camera Distance: Zoom in and out  [+ -, wheel]" },
     { "Stellar Brightness", MouseControlClass::Slider, 3, Qt::SizeHorCursor, { 1.03, 0.1, 5e12, 0 },
         "Stellar Brightness: Change absoulue luminosity" },
     { "Stellar Contrast", MouseControlClass::Slider, 5, Qt::SizeHorCursor, { 1.02, 0.1, 8.0, 0 },

@@ -54,6 +54,10 @@ inline constexpr uint32_t kDistanceQueryType = FourCC("Dist");
 inline constexpr uint32_t kRightAscensionQueryType = FourCC("RAqy");
 inline constexpr uint32_t kDeclinationQueryType = FourCC("DECy");
 
+// A list window's pad hands on a drop of CSV (files or text) from another program; its field
+// kCsvDataField points to the drop's QMimeData, good while the drop is handled.
+inline constexpr uint32_t kCsvDropMessage = FourCC("CSVd");
+
 // Resource types of the program's images and fonts.
 inline constexpr uint32_t kRaw8Type = FourCC("Raw8"); // raw 8-bit bitmaps, 255 transparent
 inline constexpr uint32_t kFontType = FourCC("FONT"); // bitmap font strips
@@ -74,3 +78,4 @@ inline constexpr const char* kSIHandlerPtrString = "Handler Pointer"; // the han
 inline constexpr const char* kSIFlagsString = "Flags"; // int32
 inline constexpr const char* kInfoStringField = "InfoString"; // string: a help text
 inline constexpr const char* kDropTagField = "drop tag"; // int32: a drop-pad tag
+inline constexpr const char* kCsvDataField = "CSV Data"; // const QMimeData*

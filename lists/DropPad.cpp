@@ -2,6 +2,7 @@
 #include "lists/DropPad.h"
 
 #include "core/MessageCodes.h"
+#include "lists/CsvDrop.h"
 #include "platform/qt/BitmapImage.h"
 #include "platform/qt/MessageDrag.h"
 #include "widgets/WidgetGeometry.h"
@@ -73,12 +74,24 @@ void DropPad::paintEvent(QPaintEvent*)
 
 void DropPad::dragEnterEvent(QDragEnterEvent* event)
 {
-    // A drag over the pad is the mouse over it: lit, with its help.
-    if (DraggedMessage(event->mimeData())) {
+    // A drag over the pad is the mouse over it: lit, with its help. Sets come as messages from
+    // this program's views and as CSV from others.
+    const bool message = DraggedMessage(event->mimeData()) != nullptr;
+    fCsvDrag = !message && CsvDrop::Offers(event->mimeData());
+    if (message)
         event->acceptProposedAction();
-        Highlight(true);
-        IBroadcastInfo();
-    }
+    else if (!fCsvDrag || !CsvDrop::AcceptCopy(event))
+        return;
+    Highlight(true);
+    IBroadcastInfo();
+}
+
+void DropPad::dragMoveEvent(QDragMoveEvent* event)
+{
+    if (fCsvDrag)
+        CsvDrop::AcceptCopy(event);
+    else
+        AcceptMessageDrag(event);
 }
 
 void DropPad::dragLeaveEvent(QDragLeaveEvent*)
@@ -91,7 +104,6 @@ void DropPad::dropEvent(QDropEvent* event)
 {
     Highlight(false);
     IClearInfo();
-    Message message;
-    if (TakeDroppedMessage(event, this, &message))
-        MessageReceived(&message);
+    // The pad tags what comes, then the window reads it, CSV too while the drop's data lasts.
+    CsvDrop::Deliver(event, this, this);
 }

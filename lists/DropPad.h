@@ -1,6 +1,6 @@
 // A drop pad of the list window: a picture that lights up while something is over it and
 // stamps what is dropped on it with its tag, the set operation it stands for, before handing
-// it to its window.
+// it to its window. It takes this program's sets and systems, and CSV tables from others.
 #pragma once
 
 #include "platform/BPoint.h"
@@ -37,6 +37,7 @@ protected:
     bool PassesTransitsOn() const override { return false; }
     void paintEvent(QPaintEvent* event) override;
     void dragEnterEvent(QDragEnterEvent* event) override;
+    void dragMoveEvent(QDragMoveEvent* event) override;
     void dragLeaveEvent(QDragLeaveEvent* event) override;
     void dropEvent(QDropEvent* event) override;
 
@@ -49,4 +50,5 @@ private:
     int32_t tagValue;
     BHandler* fHandler; // not owned
     bool fHighlighted = false;
+    bool fCsvDrag = false; // the drag over the pad offers CSV (so it is taken as a copy)
 };

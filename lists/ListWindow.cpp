@@ -1,18 +1,24 @@
-// The list window: its pads, count line, check box, list and handle, and the set operations
-// a drop makes.
+// The list window: its pads, count line, check box, list and handle, the set operations a drop
+// makes, and the set saved as CSV and read from CSV drops.
 #include "lists/ListWindow.h"
 
 #include "core/MessageCodes.h"
+#include "lists/CsvDrop.h"
 #include "lists/DropPad.h"
+#include "lists/SetCsvSaver.h"
 #include "lists/StarDragger.h"
 #include "lists/StarListView.h"
 #include "platform/qt/MessageDrag.h"
+#include "query/SystemSetCsv.h"
 #include "widgets/IButton.h"
 #include "widgets/InfoView.h"
 #include "widgets/WidgetGeometry.h"
 
+#include <QContextMenuEvent>
 #include <QDragEnterEvent>
 #include <QDropEvent>
+#include <QMenu>
+#include <QShortcut>
 #include <cstdio>
 #include <vector>
 
@@ -39,6 +45,8 @@ constexpr PadEntry kPads[] = {
 constexpr float kHiddenHeight = 68; // the frame height while the list is switched off
 constexpr float kMinimumHeight = 120, kMaximumHeight = 32000;
 
+const QKeySequence kSaveKey(Qt::CTRL | Qt::Key_S);
+
 } // namespace
 
 ListWindow::ListWindow(BPoint where, float width, float height, const char* title,
@@ -50,6 +58,7 @@ ListWindow::ListWindow(BPoint where, float width, float height, const char* titl
     , showList(true)
     , frameWidth(width)
     , savedHeight(height)
+    , fInfoTarget(infoTarget)
 {
     setAttribute(Qt::WA_DeleteOnClose);
     setWindowTitle(QString::fromUtf8(title));
@@ -85,11 +94,22 @@ ListWindow::ListWindow(BPoint where, float width, float height, const char* titl
     listView = new StarListView(
         BRect(0, 71, float(w - 1), float(this->height() - 1)), "The List", mask, fMainView);
     listView->ISetTarget(infoTarget);
-    listView->ISetInfo("Star List: Drag stars to another view");
+    listView->ISetInfo("Star List: Drag stars to another view  [Ctrl+S]");
 
-    starDragger = new StarDragger(BPoint(frameWidth - 42, 10), "Star Dragger", mask, fMainView);
+    starDragger
+        = new StarDragger(BPoint(frameWidth - 42, 10), "Star Dragger", mask, universe, fMainView);
     starDragger->ISetTarget(infoTarget);
-    starDragger->ISetInfo("Star List Dragger: Drag to another view");
+    starDragger->ISetInfo("Star List Dragger: Drag to another view  [Ctrl+S]");
+
+    fContextMenu = new QMenu(this);
+    fSaveAction = fContextMenu->addAction(QStringLiteral("Save as CSV\u2026"));
+    // Shown in the menu; the window's shortcut below is what answers the key.
+    fSaveAction->setShortcut(kSaveKey);
+    fSaveAction->setShortcutContext(Qt::WidgetShortcut);
+    connect(fSaveAction, &QAction::triggered, this, [this] { SaveAsCsv(); });
+    auto* saveKey = new QShortcut(kSaveKey, this);
+    saveKey->setContext(Qt::WindowShortcut);
+    connect(saveKey, &QShortcut::activated, this, [this] { SaveAsCsv(); });
     show();
 }
 
@@ -136,6 +156,12 @@ void ListWindow::MessageReceived(Message* message)
         DropSystem(index, tagged, tag);
         break;
     }
+    case kCsvDropMessage: {
+        const auto* data = static_cast<const QMimeData*>(message->FindPointer(kCsvDataField));
+        if (!data || !DropCsv(data, tagged, tag))
+            return;
+        break;
+    }
     case kShowListChanged:
         showList = showListBox->isChecked();
         if (!showList) {
@@ -151,11 +177,69 @@ void ListWindow::MessageReceived(Message* message)
     default:
         return;
     }
+    ShowCount();
+    BuildList();
+}
+
+void ListWindow::ShowCount()
+{
     count = mask->CountItems(true);
     char text[64];
     std::snprintf(text, sizeof text, "Star Systems: %ld", long(count));
     countView->setText(QString::fromUtf8(text));
-    BuildList();
+}
+
+bool ListWindow::DropCsv(const QMimeData* data, bool tagged, uint32_t tag)
+{
+    auto report = [this](const QString& text) {
+        fCsvReport = text;
+        Message info(kInfoMessage);
+        info.AddString(kInfoStringField, text.toUtf8().constData());
+        PostMessage(fInfoTarget, info);
+    };
+    std::vector<CsvDrop::Table> tables;
+    QString error;
+    if (!CsvDrop::Take(data, &tables, &error)) {
+        report(error);
+        return false;
+    }
+    if (!fMatcher)
+        fMatcher = SystemMatcher::Shared(universe);
+    // Several files make one set; they are all read before the list changes.
+    StarSysMask found(systemCount, false, 0), one(systemCount, false, 0);
+    SystemSetCsvResult total;
+    total.ok = true;
+    for (const CsvDrop::Table& table : tables) {
+        const std::string label = table.label.toStdString();
+        const SystemSetCsvResult result = SystemSetCsv::Read(
+            std::string_view(table.text.constData(), size_t(table.text.size())), *fMatcher, &one);
+        if (!result.ok) {
+            report(QString::fromStdString(SystemSetCsv::Describe(result, label)));
+            return false;
+        }
+        found += one;
+        total.rows += result.rows;
+        total.matchedRows += result.matchedRows;
+        total.unmatchedLines.insert(
+            total.unmatchedLines.end(), result.unmatchedLines.begin(), result.unmatchedLines.end());
+    }
+    total.systems = found.CountItems(true);
+    const std::string label = tables.size() == 1 ? tables[0].label.toStdString()
+                                                 : std::to_string(tables.size()) + " CSV files";
+    DropSet(&found, tagged, tag);
+    report(QString::fromStdString(SystemSetCsv::Describe(total, label)));
+    return true;
+}
+
+bool ListWindow::SaveAsCsv()
+{
+    return SetCsvSaver::Save(this, *universe, *mask);
+}
+
+void ListWindow::contextMenuEvent(QContextMenuEvent* event)
+{
+    fContextMenu->popup(event->globalPos());
+    event->accept();
 }
 
 void ListWindow::DropSet(const StarSysMask* set, bool tagged, uint32_t tag)
@@ -241,17 +325,20 @@ void ListWindow::resizeEvent(QResizeEvent*)
 
 void ListWindow::dragEnterEvent(QDragEnterEvent* event)
 {
-    AcceptMessageDrag(event);
+    // Whether the drag is CSV is settled here, once: telling plain text from a table reads it.
+    fCsvDrag = !DraggedMessage(event->mimeData()) && CsvDrop::Offers(event->mimeData());
+    dragMoveEvent(event);
 }
 
 void ListWindow::dragMoveEvent(QDragMoveEvent* event)
 {
-    AcceptMessageDrag(event);
+    if (fCsvDrag)
+        CsvDrop::AcceptCopy(event);
+    else
+        AcceptMessageDrag(event);
 }
 
 void ListWindow::dropEvent(QDropEvent* event)
 {
-    Message message;
-    if (TakeDroppedMessage(event, this, &message))
-        MessageReceived(&message);
+    CsvDrop::Deliver(event, this, this);
 }

@@ -63,8 +63,13 @@ MessageMimeData::MessageMimeData(const Message& message)
 
 QDrag* MakeMessageDrag(QWidget* source, const Message& message, RBitmap8* image, BPoint hotSpot)
 {
+    return MakeMessageDrag(source, new MessageMimeData(message), image, hotSpot);
+}
+
+QDrag* MakeMessageDrag(QWidget* source, MessageMimeData* data, RBitmap8* image, BPoint hotSpot)
+{
     auto* drag = new QDrag(source);
-    drag->setMimeData(new MessageMimeData(message));
+    drag->setMimeData(data);
     if (image) {
         drag->setPixmap(DragPixmap(*image));
         new DragImageShaper(*image, drag); // owned by the drag, lives as long as it does
@@ -75,7 +80,12 @@ QDrag* MakeMessageDrag(QWidget* source, const Message& message, RBitmap8* image,
 
 Qt::DropAction DragMessage(QWidget* source, const Message& message, RBitmap8* image, BPoint hotSpot)
 {
-    QDrag* drag = MakeMessageDrag(source, message, image, hotSpot);
+    return DragMessage(source, new MessageMimeData(message), image, hotSpot);
+}
+
+Qt::DropAction DragMessage(QWidget* source, MessageMimeData* data, RBitmap8* image, BPoint hotSpot)
+{
+    QDrag* drag = MakeMessageDrag(source, data, image, hotSpot);
     return drag->exec(Qt::CopyAction);
 }
 

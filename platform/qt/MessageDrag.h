@@ -32,10 +32,14 @@ private:
 // transparent, with or without a compositing manager), held at hotSpot (bitmap coordinates). The
 // caller runs it with exec(); headless tests look at what it carries instead.
 QDrag* MakeMessageDrag(QWidget* source, const Message& message, RBitmap8* image, BPoint hotSpot);
+// The same with a payload of the caller's (the drag takes it over): a subclass that offers other
+// programs the dragged thing in formats of their own as well as the message.
+QDrag* MakeMessageDrag(QWidget* source, MessageMimeData* data, RBitmap8* image, BPoint hotSpot);
 
 // Builds the drag and runs it until the button is let go; returns what happened to it.
 Qt::DropAction DragMessage(
     QWidget* source, const Message& message, RBitmap8* image, BPoint hotSpot);
+Qt::DropAction DragMessage(QWidget* source, MessageMimeData* data, RBitmap8* image, BPoint hotSpot);
 
 // What a view that starts drags may be given instead of running them: it is handed the
 // message, the image and the hot spot. For tests, which cannot let a drag's own event loop

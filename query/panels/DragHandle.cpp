@@ -23,6 +23,16 @@ void DragHandle::StartDrag(const Message& message, RBitmap8* image)
     StartMessageDrag(fDragStarter, this, message, image, BPoint(1, 1));
 }
 
+void DragHandle::StartDrag(MessageMimeData* data, RBitmap8* image)
+{
+    if (fDragStarter) {
+        fDragStarter(data->GetMessage(), image, BPoint(1, 1));
+        delete data;
+        return;
+    }
+    DragMessage(this, data, image, BPoint(1, 1));
+}
+
 void DragHandle::MouseMoved(QPoint, Transit transit)
 {
     if (transit == B_ENTERED_VIEW || transit == B_EXITED_VIEW) {

@@ -29,6 +29,9 @@ protected:
     virtual void Pressed() = 0;
     // Drags message with image held at its point (1, 1), or hands both to the drag starter.
     void StartDrag(const Message& message, RBitmap8* image);
+    // The same with a payload that offers more than the message (taken over; a drag starter is
+    // handed its message).
+    void StartDrag(MessageMimeData* data, RBitmap8* image);
 
     void MouseMoved(QPoint where, Transit transit) override;
     bool PassesTransitsOn() const override { return false; }

@@ -1,8 +1,10 @@
 // The labelled text field: its two parts and where they stand.
 #include "query/panels/TextControl.h"
 
+#include "platform/qt/MessageDrag.h"
 #include "widgets/WidgetGeometry.h"
 
+#include <QDropEvent>
 #include <QLabel>
 #include <QLineEdit>
 
@@ -17,7 +19,21 @@ TextControl::TextControl(BRect frame, const char* name, const char* label, const
     fLabel->setBuddy(fField);
     fLabel->setVisible(fDivider > 0);
     setFocusProxy(fField);
+    fField->installEventFilter(this);
     resizeEvent(nullptr);
+}
+
+bool TextControl::eventFilter(QObject* watched, QEvent* event)
+{
+    const QEvent::Type type = event->type();
+    if (watched == fField
+        && (type == QEvent::DragEnter || type == QEvent::DragMove || type == QEvent::Drop)
+        && DraggedMessage(static_cast<QDropEvent*>(event)->mimeData())) {
+        // Refused here, the drag goes on to the field's parents.
+        event->ignore();
+        return true;
+    }
+    return QWidget::eventFilter(watched, event);
 }
 
 const char* TextControl::Text() const

@@ -26,6 +26,9 @@ public:
 
 protected:
     void resizeEvent(QResizeEvent* event) override;
+    // Keeps the field out of drags of this program's sets and systems: a list's drag also
+    // offers its table as text, for other programs, which is no text for the field.
+    bool eventFilter(QObject* watched, QEvent* event) override;
 
 private:
     QLabel* fLabel; // a child; hidden when the divider is 0

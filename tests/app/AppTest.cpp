@@ -5,17 +5,46 @@
 #include "core/MessageCodes.h"
 #include "render/SpectralTables.h"
 
+#include <QIcon>
+#include <QImage>
 #include <QPointer>
+#include <QTest>
 #include <QTimer>
 #include <QWindow>
 #include <gtest/gtest.h>
 
-TEST(ThreeDNightdomeApp, BuildsTheSpectralTablesAndOpensTheControls)
+namespace {
+
+// The application object as main makes it, with no options.
+ThreeDNightdomeApp* NewApplication()
 {
+    // The test's own QApplication exists, so these are not kept.
     int argc = 1;
     char name[] = "nightdome";
     char* argv[] = { name, nullptr };
-    auto* application = new ThreeDNightdomeApp(argc, argv);
+    return new ThreeDNightdomeApp(argc, argv);
+}
+
+// Runs the program's event loop; false when it had not ended after ten seconds and was stopped.
+bool RunsToItsEnd(ThreeDNightdomeApp* application)
+{
+    bool timedOut = false;
+    QTimer guard; // ends a run that would not end
+    guard.setSingleShot(true);
+    QObject::connect(&guard, &QTimer::timeout, [&] {
+        timedOut = true;
+        QCoreApplication::quit();
+    });
+    guard.start(10000);
+    EXPECT_EQ(application->Run(), 0);
+    return !timedOut;
+}
+
+} // namespace
+
+TEST(ThreeDNightdomeApp, BuildsTheSpectralTablesAndOpensTheControls)
+{
+    auto* application = NewApplication();
     ASSERT_NE(gSpectralCTable, nullptr);
     // Entry 127 of the M table is its class colour one step short; entry 255 of every table is
     // grey 225 one step short.
@@ -42,32 +71,18 @@ TEST(ThreeDNightdomeApp, BuildsTheSpectralTablesAndOpensTheControls)
 
 TEST(ThreeDNightdomeApp, ClosingTheControlsEndsTheProgramWithChartsOpen)
 {
-    int argc = 1;
-    char name[] = "nightdome";
-    char* argv[] = { name, nullptr };
-    auto* application = new ThreeDNightdomeApp(argc, argv);
+    auto* application = NewApplication();
     ControlWindow* controls = application->GetControlWindow();
     ASSERT_EQ(controls->UniverseWindows().size(), 1);
-    bool timedOut = false;
     QTimer::singleShot(100, controls, [controls] { controls->close(); });
-    QTimer guard; // ends a run that would not end, and goes away with this test
-    guard.setSingleShot(true);
-    QObject::connect(&guard, &QTimer::timeout, [&] {
-        timedOut = true;
-        QCoreApplication::quit();
-    });
-    guard.start(10000);
-    EXPECT_EQ(application->Run(), 0);
-    EXPECT_FALSE(timedOut) << "the program did not end";
+    const bool ended = RunsToItsEnd(application);
+    EXPECT_TRUE(ended) << "the program did not end";
     delete application;
 }
 
 TEST(ThreeDNightdomeApp, ClosingTheOnlyChartLeavesTheProgramRunning)
 {
-    int argc = 1;
-    char name[] = "nightdome";
-    char* argv[] = { name, nullptr };
-    auto* application = new ThreeDNightdomeApp(argc, argv);
+    auto* application = NewApplication();
     ControlWindow* controls = application->GetControlWindow();
     ASSERT_EQ(controls->UniverseWindows().size(), 1);
     QPointer<UniverseWindow> chart = controls->UniverseWindows().first().data();
@@ -90,17 +105,49 @@ TEST(ThreeDNightdomeApp, ClosingTheOnlyChartLeavesTheProgramRunning)
         controls->close();
     });
     poll.start(10);
-    bool timedOut = false;
-    QTimer guard; // ends a run that would not end, and goes away with this test
-    guard.setSingleShot(true);
-    QObject::connect(&guard, &QTimer::timeout, [&] {
-        timedOut = true;
-        QCoreApplication::quit();
-    });
-    guard.start(10000);
-    EXPECT_EQ(application->Run(), 0);
+    const bool ended = RunsToItsEnd(application);
     EXPECT_TRUE(stillRunning) << "closing the only chart ended the program";
     EXPECT_EQ(chartsAfter, 1);
-    EXPECT_FALSE(timedOut) << "closing the controls did not end the program";
+    EXPECT_TRUE(ended) << "closing the controls did not end the program";
+    delete application;
+}
+
+TEST(ThreeDNightdomeApp, CtrlQInAChartEndsTheProgram)
+{
+    auto* application = NewApplication();
+    ControlWindow* controls = application->GetControlWindow();
+    ASSERT_EQ(controls->UniverseWindows().size(), 1);
+    QPointer<UniverseWindow> chart = controls->UniverseWindows().first().data();
+    bool typed = false;
+    QTimer::singleShot(100, controls, [&] {
+        chart->activateWindow();
+        if (!QTest::qWaitForWindowActive(chart))
+            return;
+        typed = true;
+        QTest::keyClick(chart->windowHandle(), Qt::Key_Q, Qt::ControlModifier);
+    });
+    const bool ended = RunsToItsEnd(application);
+    EXPECT_TRUE(typed) << "the chart never became the active window";
+    EXPECT_TRUE(ended) << "Ctrl+Q did not end the program";
+    EXPECT_FALSE(controls->isVisible());
+    delete application;
+}
+
+TEST(ThreeDNightdomeApp, NamesItselfToTheDesktopAndCarriesItsIcons)
+{
+    auto* application = NewApplication();
+    // The desktop entry and the icons are installed under this name.
+    EXPECT_EQ(QGuiApplication::desktopFileName(), ND_DESKTOP_ID);
+    EXPECT_STREQ(kDesktopFileId, ND_DESKTOP_ID);
+    EXPECT_EQ(QCoreApplication::applicationVersion(), ND_VERSION);
+    const QIcon icon = QGuiApplication::windowIcon();
+    for (int size : { 16, 32, 48, 64, 128, 256 }) {
+        EXPECT_TRUE(icon.availableSizes().contains(QSize(size, size))) << size;
+        const QImage image = icon.pixmap(QSize(size, size)).toImage();
+        ASSERT_EQ(image.size(), QSize(size, size));
+        // A round dome: clear corners, an opaque middle.
+        EXPECT_EQ(qAlpha(image.pixel(0, 0)), 0) << size;
+        EXPECT_EQ(qAlpha(image.pixel(size / 2, size / 2)), 255) << size;
+    }
     delete application;
 }

@@ -94,8 +94,16 @@ protected:
             ASSERT_TRUE(fWindowManager.Start()) << "openbox did not take over the screen";
         }
         InitResources();
-        // The program with a small catalogue beside it.
         ASSERT_TRUE(fDir.isValid());
+        ASSERT_NO_FATAL_FAILURE(PrepareProgram());
+        fProgram.setProcessChannelMode(QProcess::ForwardedChannels);
+        fProgram.start();
+        ASSERT_TRUE(fProgram.waitForStarted(10000));
+    }
+
+    // The program with a small catalogue beside it.
+    virtual void PrepareProgram()
+    {
         ASSERT_TRUE(QFile::copy(ND_PROGRAM, fDir.filePath("nightdome")));
         QFile::setPermissions(fDir.filePath("nightdome"), QFile::ReadOwner | QFile::ExeOwner);
         QFile catalogue(fDir.filePath("stars.dat"));
@@ -103,9 +111,6 @@ protected:
         catalogue.write(kSmallCatalogue);
         catalogue.close();
         fProgram.setProgram(fDir.filePath("nightdome"));
-        fProgram.setProcessChannelMode(QProcess::ForwardedChannels);
-        fProgram.start();
-        ASSERT_TRUE(fProgram.waitForStarted(10000));
     }
 
     void TearDown() override

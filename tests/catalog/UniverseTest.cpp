@@ -8,6 +8,8 @@
 #include <gtest/gtest.h>
 
 #include <cmath>
+#include <cstdio>
+#include <memory>
 #include <string>
 
 namespace {
@@ -412,4 +414,56 @@ TEST(GeneratedUniverse, NegativeDrawsReachThreeTimesTheRadiusBelow)
         }
     }
     EXPECT_LT(lowest, -20.0); // the generator went negative somewhere
+}
+
+TEST(GeneratedUniverse, GenerateMakesExactlyTheCountAskedFor)
+{
+    for (int32_t count : { 0, 1, 31, 1000, 12345 }) {
+        std::unique_ptr<Universe> u(
+            Universe::Generate(count, kSparseDensity, 5000, Random(1, 4096, 150889, 714025)));
+        EXPECT_EQ(u->CountItems(), count);
+    }
+    std::unique_ptr<Universe> none(Universe::Generate(-5, kSparseDensity, 5000));
+    EXPECT_EQ(none->CountItems(), 0);
+}
+
+TEST(GeneratedUniverse, GenerateKeepsTheDensityAndTheDraws)
+{
+    // 31 systems at sparse density is the cube of radius 10 (pi x 10^3 x 0.01 = 31.4), give or
+    // take the truncation: the radius chosen is cbrt(31 / (pi x 0.01)) = 9.955.
+    const double radius = std::cbrt(31 / (3.141592653589793 * 0.01));
+    std::unique_ptr<Universe> u(
+        Universe::Generate(31, kSparseDensity, 50, Random(1, 4096, 150889, 714025)));
+    ASSERT_EQ(u->CountItems(), 31);
+    // The same draws as the constructor: 14985, 1224, 19543 for the first system.
+    const StarSystem* first = u->SystemAt(0);
+    EXPECT_NEAR(first->position.x, 14985 * 0.0001 * radius - radius, 1e-12);
+    EXPECT_NEAR(first->position.y, 1224 * 0.0001 * radius - radius, 1e-12);
+    EXPECT_NEAR(first->position.z, 19543 * 0.0001 * radius - radius, 1e-12);
+    const Universe same(10.0, kSparseDensity, 50, Random(1, 4096, 150889, 714025));
+    for (int i = 0; i < 31; i++) {
+        const SVector& p = u->SystemAt(i)->position;
+        const SVector& q = same.SystemAt(i)->position;
+        EXPECT_NEAR(p.x / radius, q.x / 10.0, 1e-12) << i;
+        EXPECT_NEAR(p.z / radius, q.z / 10.0, 1e-12) << i;
+        EXPECT_STREQ(u->SystemAt(i)->GetName(), "");
+        EXPECT_EQ(u->SystemAt(i)->CountItems(), 0);
+    }
+}
+
+TEST_F(UniverseTest, ReadingSaysWhenItStoppedAtTheLimit)
+{
+    const TempCatalogue file("A\nG2 1 1 1 1\nB\nG2 1 1 1 1\nC\nG2 1 2 2 2\n");
+    const auto read = [&](int32_t maxStars, Universe* universe) {
+        std::unique_ptr<std::FILE, int (*)(std::FILE*)> in(
+            std::fopen(file.PathString().c_str(), "rb"), &std::fclose);
+        return ReadCatalogue(in.get(), maxStars, universe);
+    };
+    Universe two(5000), three(5000), more(5000);
+    EXPECT_TRUE(read(2, &two)); // C is left
+    EXPECT_EQ(two.CountItems(), 1);
+    EXPECT_FALSE(read(3, &three)); // exactly the file
+    EXPECT_EQ(three.CountItems(), 2);
+    EXPECT_FALSE(read(1000000, &more));
+    EXPECT_EQ(more.CountItems(), 2);
 }

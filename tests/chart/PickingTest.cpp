@@ -156,7 +156,7 @@ TEST_F(PickingTest, DataLinesAndHelpTextsLetterForLetter)
 
     view->originOffset.Set(1, 2, 3);
     view->SetDataString(-1, -1);
-    EXPECT_STREQ(view->IGetInfo(), "Click to return Origin to the sun");
+    EXPECT_STREQ(view->IGetInfo(), "Click to return Origin to the sun  [Home]");
 }
 
 TEST_F(PickingTest, TextsGoToTheirTargets)
@@ -265,4 +265,47 @@ TEST_F(PickingTest, FindSystemTakesTheNearestUnderThePoint)
     EXPECT_EQ(view->FindSystem(BPoint(14, 49)), -1);
     EXPECT_EQ(view->FindSystem(BPoint(9, 45)), -1);
     EXPECT_EQ(view->FindSystem(BPoint(50, 20)), -1);
+}
+
+TEST_F(PickingTest, ReturningToTheSunWithoutASystemAtTheOriginGoesBackToTheStart)
+{
+    // The Sun of this row stands 0.001 pc off the origin: no system is at (0, 0, 0).
+    ClickOn(2);
+    ClickOn(2);
+    ASSERT_EQ(view->OriginSystem(), 2);
+    ASSERT_EQ(view->originOffset.x, -10);
+    view->ReturnOriginToSun();
+    EXPECT_EQ(view->OriginSystem(), 0);
+    EXPECT_EQ(view->originOffset.x, 0);
+    EXPECT_EQ(view->originOffset.y, 0);
+    EXPECT_EQ(view->originOffset.z, 0);
+    // Nothing else of the click on empty space: the selection stays.
+    EXPECT_EQ(view->GetSelectedSystem(), 2);
+}
+
+TEST_F(ChartTest, ReturningToTheSunFindsTheSystemAtTheOrigin)
+{
+    UniverseView* view = MakeView(MakeUniverse({
+        { "Alpha", -10, 0, 25, 4.38 },
+        { "The Sun", 0, 0, 0, 4.83 },
+        { "Beta", 10, 0, 25, 1.42 },
+    }));
+    Message star(kStarMessage);
+    star.AddInt32(kSystemIndexString, 2);
+    view->MessageReceived(&star);
+    ASSERT_EQ(view->OriginSystem(), 2);
+    EXPECT_EQ(view->ReadOut().rfind("Origin: Beta\n", 0), 0u) << view->ReadOut();
+    for (int i = 0; i < 200; i++)
+        view->NextTransform();
+    ASSERT_NEAR(view->cameraPosition.x, -10, 1e-9);
+    view->ReturnOriginToSun();
+    EXPECT_EQ(view->OriginSystem(), 1);
+    EXPECT_EQ(view->originOffset.x, 0);
+    EXPECT_EQ(view->originOffset.z, 0);
+    EXPECT_EQ(view->ReadOut().rfind("Origin: The Sun\n", 0), 0u) << view->ReadOut();
+    // The camera glides back over the next frames, as after any change of origin.
+    for (int i = 0; i < 200; i++)
+        view->NextTransform();
+    EXPECT_NEAR(view->cameraPosition.x, 0, 1e-9);
+    EXPECT_NEAR(view->cameraPosition.z, 0, 1e-9);
 }

@@ -62,8 +62,8 @@ TEST_F(ControlWindowTest, TheStripOfControlsAndButtons)
     }
     EXPECT_STREQ(controls.findChild<IPictureButton*>("Show H-R Window Button")->IGetInfo(),
         "New Hertzprung-Russell Diagram window");
-    EXPECT_STREQ(
-        controls.findChild<IPictureButton*>("New Nightdome Button")->IGetInfo(), "New Nightdome");
+    EXPECT_STREQ(controls.findChild<IPictureButton*>("New Nightdome Button")->IGetInfo(),
+        "New Nightdome  [Ctrl+N]");
     // The first chart is open and driven.
     ASSERT_EQ(controls.UniverseWindows().size(), 1);
     UniverseWindow* first = controls.UniverseWindows()[0];

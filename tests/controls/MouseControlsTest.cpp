@@ -34,8 +34,9 @@ TEST_F(Table, TheFiveControlsInTheirOrder)
     const int32_t resources[] = { 1, 2, 3, 5, 4 };
     const Qt::CursorShape cursors[] = { Qt::SizeAllCursor, Qt::SizeVerCursor, Qt::SizeHorCursor,
         Qt::SizeHorCursor, Qt::SizeHorCursor };
-    const char* help[] = { "Virtual Trackball: Rotate nightdome",
-        "Camera Distance: Zoom in and out", "Stellar Brightness: Change absoulue luminosity",
+    const char* help[] = { "Virtual Trackball: Rotate nightdome  [arrows]",
+        "Camera Distance: Zoom in and out  [+ -, wheel]",
+        "Stellar Brightness: Change absoulue luminosity",
         "Stellar Contrast: Change relative luminosity",
         "Clipping Sphere: Hide stars beyond radius R" };
     for (size_t i = 0; i < 5; i++) {

@@ -131,10 +131,11 @@ TEST_F(ListTest, ANewListWindowAndItsParts)
     EXPECT_EQ(list->listView->objectName(), "The List");
     EXPECT_EQ(list->listView->geometry().top(), 71);
     EXPECT_EQ(list->listView->geometry().bottom(), 340);
-    EXPECT_STREQ(list->listView->IGetInfo(), "Star List: Drag stars to another view");
+    EXPECT_STREQ(list->listView->IGetInfo(), "Star List: Drag stars to another view  [Ctrl+S]");
     EXPECT_EQ(list->starDragger->objectName(), "Star Dragger");
     EXPECT_EQ(list->starDragger->geometry(), QRect(230 - 42, 10, 32, 32));
-    EXPECT_STREQ(list->starDragger->IGetInfo(), "Star List Dragger: Drag to another view");
+    EXPECT_STREQ(
+        list->starDragger->IGetInfo(), "Star List Dragger: Drag to another view  [Ctrl+S]");
 
     struct Expected {
         const char* name;

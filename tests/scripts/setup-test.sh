@@ -156,14 +156,14 @@ expect_empty_tmp()
 # As root, with sudo available too: apt-get directly, the lists first, then exactly the
 # missing packages.
 case_name="root-installs-what-is-missing"
-uid=0 sudo=yes missing="cmake xdotool" lists=fresh system_catalogue=yes xdg=no
+uid=0 sudo=yes missing="cmake xdotool desktop-file-utils appstream" lists=fresh system_catalogue=yes xdg=no
 run_setup
 expect_status 0
 expect_calls "apt-get" \
     "apt-get [noninteractive] update -q" \
-    "apt-get [noninteractive] install -y -q --no-install-recommends cmake xdotool"
+    "apt-get [noninteractive] install -y -q --no-install-recommends cmake xdotool desktop-file-utils appstream"
 expect_calls "sudo"
-expect_in out "setup: installing cmake xdotool"
+expect_in out "setup: installing cmake xdotool desktop-file-utils appstream"
 expect_in out "setup: star catalogue: $dir/system/stars.dat"
 
 # Not root, sudo available: both apt-get calls go through sudo, which must be told the

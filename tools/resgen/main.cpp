@@ -1,9 +1,12 @@
 // resgen: draws every image resource of the program with the program's own raster primitives and
 // font, deterministically, and writes each as <type>_<id>.raw (frames back to back) into an output
 // folder, together with a copy of the font strip. The build embeds that folder's files.
-// With --sheet it also writes a PNG contact sheet of every resource at 4x zoom.
+// With --sheet it also writes a PNG contact sheet of every resource at 4x zoom. With --icons it
+// writes the program's desktop icons instead, as nightdome-<size>.png.
 //
 // Usage: resgen <font strip .raw> <output folder> [--sheet <file.png>]
+//        resgen --icons <output folder>
+#include "AppIcon.h"
 #include "Images.h"
 #include "Sheet.h"
 
@@ -44,6 +47,12 @@ bool WriteFile(const std::filesystem::path& path, const std::vector<uint8_t>& by
 
 int main(int argc, char** argv)
 {
+    if (argc == 3 && std::string(argv[1]) == "--icons") {
+        std::string reason;
+        if (!WriteAppIcons(argv[2], &reason))
+            return Fail(argv[2], reason);
+        return 0;
+    }
     if (argc != 3 && !(argc == 5 && std::string(argv[3]) == "--sheet"))
         return Fail("usage", "resgen <font strip .raw> <output folder> [--sheet <file.png>]");
     const std::string stripPath = argv[1];

@@ -1,0 +1,66 @@
+// The save dialog, the all-or-nothing write and its failure message.
+#include "lists/SetCsvSaver.h"
+
+#include "query/SystemSetCsv.h"
+
+#include <QDir>
+#include <QFileDialog>
+#include <QMessageBox>
+#include <QSaveFile>
+#include <QStandardPaths>
+
+std::function<QString(QWidget*, const QString&)> SetCsvSaver::chooseFile
+    = [](QWidget* parent, const QString& suggested) {
+          return QFileDialog::getSaveFileName(parent, QStringLiteral("Save Star List as CSV"),
+              suggested, QStringLiteral("CSV files (*.csv);;All files (*)"));
+      };
+
+std::function<void(QWidget*, const QString&)> SetCsvSaver::showError
+    = [](QWidget* parent, const QString& text) {
+          QMessageBox::warning(parent, QStringLiteral("Star list not saved"), text);
+      };
+
+QString SetCsvSaver::SuggestedPath()
+{
+    QString folder = QStandardPaths::writableLocation(QStandardPaths::DocumentsLocation);
+    if (folder.isEmpty())
+        folder = QDir::homePath();
+    return QDir(folder).filePath(QStringLiteral("stars.csv"));
+}
+
+QString SetCsvSaver::WithCsvSuffix(const QString& path)
+{
+    return path.endsWith(QStringLiteral(".csv"), Qt::CaseInsensitive)
+        ? path
+        : path + QStringLiteral(".csv");
+}
+
+bool SetCsvSaver::Write(const QString& path, const QByteArray& bytes, QString* error)
+{
+    QSaveFile file(path);
+    if (!file.open(QIODevice::WriteOnly)) {
+        *error = QStringLiteral("Could not write %1: %2").arg(path, file.errorString());
+        return false;
+    }
+    if (file.write(bytes) != bytes.size() || !file.commit()) {
+        *error = QStringLiteral("Could not write %1: %2").arg(path, file.errorString());
+        file.cancelWriting();
+        return false;
+    }
+    return true;
+}
+
+bool SetCsvSaver::Save(QWidget* parent, const Universe& universe, const StarSysMask& set)
+{
+    const QString chosen = chooseFile ? chooseFile(parent, SuggestedPath()) : QString();
+    if (chosen.isEmpty())
+        return false;
+    const QString path = WithCsvSuffix(chosen);
+    const std::string text = SystemSetCsv::Write(universe, set);
+    QString error;
+    if (Write(path, QByteArray(text.data(), qsizetype(text.size())), &error))
+        return true;
+    if (showError)
+        showError(parent, error);
+    return false;
+}
