@@ -11,6 +11,7 @@
 // BM_ReadCsv/columns:<n>: that table read back into a set, the matcher built beforehand: 0,
 // every column (matched by name, x, y, z at hand); 1, the name column alone; 2, x, y, z alone
 // (matched by position).
+#include "MillionSystems.h"
 #include "catalog/Star.h"
 #include "catalog/Universe.h"
 #include "query/SystemMatcher.h"
@@ -32,11 +33,8 @@ const Universe& PlacedMillion()
 {
     static const std::unique_ptr<Universe> universe = [] {
         auto u = std::make_unique<Universe>(5000);
-        static const char* kClasses[]
-            = { "O9V", "B2IV", "A0V", "F5V", "G2V", "K1III", "M4Ve", "K5", "B9.5V", "G8III" };
         std::mt19937_64 random(7);
         std::uniform_real_distribution<double> unit(-1, 1);
-        char name[32];
         for (int32_t i = 0; i < kSystems; i++) {
             SVector p;
             do
@@ -44,13 +42,7 @@ const Universe& PlacedMillion()
             while (p.x * p.x + p.y * p.y + p.z * p.z > 1);
             p.Scale(150);
             auto* system = new StarSystem("", p, 1, nullptr, 2);
-            const int32_t stars = random() % 8 == 0 ? 2 : 1;
-            for (int32_t s = 0; s < stars; s++) {
-                std::snprintf(name, sizeof name, "HIP %d%s", 100000 + i, s ? " B" : "");
-                const double magnitude = static_cast<int32_t>(random() % 2100) * 0.01 - 5;
-                system->AddItem(new Star(name, kClasses[random() % 10], magnitude, 1));
-            }
-            system->SetName(system->StarAt(0)->GetName());
+            AddCatalogueStars(system, i, random);
             u->AddItem(system);
         }
         return u;

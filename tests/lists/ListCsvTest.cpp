@@ -20,6 +20,7 @@
 #include "widgets/InfoView.h"
 #include "widgets/WidgetEvents.h"
 
+#include "PadOperations.h"
 #include <QAction>
 #include <QContextMenuEvent>
 #include <QDragEnterEvent>
@@ -31,6 +32,7 @@
 #include <QTemporaryDir>
 #include <QTest>
 #include <QUrl>
+
 #include <gtest/gtest.h>
 #include <memory>
 #include <random>
@@ -344,24 +346,7 @@ TEST_F(ListCsvTest, DroppedCsvOnEachPad)
     Universe universe(50);
     for (int i = 0; i < 20; i++)
         AddTestSystem(universe, i + 1, 0, 0, { { ("S" + std::to_string(i)).c_str(), "G2V", 4.8 } });
-    std::vector<int32_t> notExpected;
-    for (int32_t i = 0; i < 20; i++) {
-        if (i != 3 && i != 4)
-            notExpected.push_back(i);
-    }
-    const struct {
-        const char* pad; // null: the window outside any pad
-        std::vector<int32_t> expected; // from {1, 2, 3} with {3, 4} dropped
-    } cases[] = {
-        { "Plus", { 1, 2, 3, 4 } },
-        { "Equals", { 3, 4 } },
-        { "Minus", { 1, 2 } },
-        { "NOT", notExpected },
-        { "AND", { 3 } },
-        { "OR", { 1, 2, 3, 4 } },
-        { "XOR", { 1, 2, 4 } },
-        { nullptr, { 1, 2, 3, 4 } },
-    };
+    const std::vector<PadOperation> cases = PadOperationsOnOneTwoThree();
     // S4 by name, S3 by position only.
     const QByteArray csv = "Name,x,y,z\r\nS4,5,0,0\r\n,4,0,0\r\n";
     for (const auto& c : cases) {

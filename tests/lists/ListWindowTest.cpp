@@ -22,11 +22,13 @@
 #include "widgets/InfoView.h"
 #include "widgets/WidgetEvents.h"
 
+#include "PadOperations.h"
 #include <QDragEnterEvent>
 #include <QDropEvent>
 #include <QItemSelectionModel>
 #include <QTest>
 #include <cstring>
+
 #include <gtest/gtest.h>
 #include <optional>
 
@@ -166,26 +168,8 @@ TEST_F(ListTest, ANewListWindowAndItsParts)
 
 TEST_F(ListTest, SetsDroppedOnEachPad)
 {
-    struct Case {
-        const char* pad; // null: the window outside any pad
-        std::vector<int32_t> expected; // from {1, 2, 3} with {3, 4} dropped
-    };
-    std::vector<int32_t> notExpected;
-    for (int32_t i = 0; i < 20; i++) {
-        if (i != 3 && i != 4)
-            notExpected.push_back(i);
-    }
-    const Case cases[] = {
-        { nullptr, { 1, 2, 3, 4 } },
-        { "Plus", { 1, 2, 3, 4 } },
-        { "Equals", { 3, 4 } },
-        { "Minus", { 1, 2 } },
-        { "NOT", notExpected },
-        { "AND", { 3 } },
-        { "OR", { 1, 2, 3, 4 } },
-        { "XOR", { 1, 2, 4 } },
-    };
-    for (const Case& c : cases) {
+    const std::vector<PadOperation> cases = PadOperationsOnOneTwoThree();
+    for (const PadOperation& c : cases) {
         auto list = NewList();
         Drop(list->Pad("Equals"), SetMessage(Set({ 1, 2, 3 })));
         ASSERT_EQ(Members(*list), std::vector<int32_t>({ 1, 2, 3 }));
