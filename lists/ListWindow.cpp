@@ -17,8 +17,10 @@
 #include <QContextMenuEvent>
 #include <QDragEnterEvent>
 #include <QDropEvent>
+#include <QFontMetrics>
 #include <QMenu>
 #include <QShortcut>
+#include <algorithm>
 #include <cstdio>
 #include <vector>
 
@@ -86,6 +88,7 @@ ListWindow::ListWindow(BPoint where, float width, float height, const char* titl
 
     showListBox = new ICheckBox(BRect(float(w - 1) - 80, 49, float(w - 1), 63), "Show List CB",
         "Show List", new Message(kShowListChanged), fMainView);
+    WidenCountView();
     showListBox->setChecked(true);
     showListBox->SetTarget(this);
     showListBox->ISetTarget(infoTarget);
@@ -179,6 +182,22 @@ void ListWindow::MessageReceived(Message* message)
     }
     ShowCount();
     BuildList();
+}
+
+void ListWindow::WidenCountView()
+{
+    // 100 pixels hold "Star Systems: " and two digits of our font: the count line reaches as far
+    // as a count of seven digits needs (a million systems), never under the check box.
+    countView->ensurePolished();
+    const QFontMetrics metrics(countView->font());
+    int digit = 0;
+    for (char c = '0'; c <= '9'; c++)
+        digit = std::max(digit, metrics.horizontalAdvance(QChar(c)));
+    const int needed = metrics.horizontalAdvance(QStringLiteral("Star Systems: ")) + 7 * digit
+        + 2 * countView->margin() + 1;
+    const int room = showListBox->geometry().left();
+    countView->resize(std::clamp(needed, countView->width(), std::max(room, countView->width())),
+        countView->height());
 }
 
 void ListWindow::ShowCount()

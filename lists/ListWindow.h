@@ -81,6 +81,8 @@ private:
     // way the help line says what happened. False when nothing was read.
     bool DropCsv(const QMimeData* data, bool tagged, uint32_t tag);
     void ShowCount();
+    // Makes the count line wide enough for every count up to a million in the window's font.
+    void WidenCountView();
     // Fixes the height (list hidden) or lets it go from 120 up (list shown).
     void SetHeightLimits();
 

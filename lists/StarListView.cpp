@@ -6,6 +6,7 @@
 #include "render/RBitmap8.h"
 #include "widgets/WidgetGeometry.h"
 
+#include <QItemSelectionModel>
 #include <QMouseEvent>
 #include <algorithm>
 
@@ -108,20 +109,32 @@ void StarListView::MouseMoved(QPoint, Transit transit)
 
 void StarListView::mousePressEvent(QMouseEvent* event)
 {
-    QListView::mousePressEvent(event);
-    const QModelIndex item = indexAt(event->position().toPoint());
+    const QPoint where = event->position().toPoint();
+    const QModelIndex item = indexAt(where);
+    fPressPoint = where;
     fPressedRow = event->button() == Qt::LeftButton && item.isValid() ? item.row() : -1;
-    fPressPoint = event->position().toPoint();
+    // A plain press on one of several selected items may start a drag of all of them: the
+    // selection stays as it is until the button comes up inside the start box.
+    fClickPending = fPressedRow >= 0 && event->modifiers() == Qt::NoModifier
+        && selectionModel()->isSelected(item) && selectionModel()->selectedRows().size() >= 2;
+    if (fClickPending) {
+        event->accept();
+        return;
+    }
+    QListView::mousePressEvent(event);
 }
 
 void StarListView::mouseMoveEvent(QMouseEvent* event)
 {
-    const QPoint where = event->position().toPoint();
-    if (fPressedRow >= 0 && (event->buttons() & Qt::LeftButton)
-        && (std::abs(where.x() - fPressPoint.x()) > 6
-            || std::abs(where.y() - fPressPoint.y()) > 6)) {
+    if (fPressedRow >= 0 && (event->buttons() & Qt::LeftButton)) {
+        const QPoint where = event->position().toPoint();
+        // Inside the start box the list neither drags nor drag-selects.
+        if (std::abs(where.x() - fPressPoint.x()) <= 6
+            && std::abs(where.y() - fPressPoint.y()) <= 6)
+            return;
         const int32_t row = fPressedRow;
         fPressedRow = -1;
+        fClickPending = false;
         InitiateDrag(row);
         // The drag took the button's release: the list waits for a new press.
         setState(QAbstractItemView::NoState);
@@ -132,6 +145,15 @@ void StarListView::mouseMoveEvent(QMouseEvent* event)
 
 void StarListView::mouseReleaseEvent(QMouseEvent* event)
 {
+    const int32_t clicked = fClickPending ? fPressedRow : -1;
     fPressedRow = -1;
+    fClickPending = false;
+    if (clicked >= 0) {
+        // Released inside the start box: an ordinary click, which selects that item alone.
+        selectionModel()->setCurrentIndex(
+            fModel->index(clicked), QItemSelectionModel::ClearAndSelect);
+        event->accept();
+        return;
+    }
     QListView::mouseReleaseEvent(event);
 }

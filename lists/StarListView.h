@@ -71,4 +71,7 @@ private:
     DragStarter fDragStarter;
     int32_t fPressedRow = -1; // the item the button went down on, -1 when none
     QPoint fPressPoint;
+    // The press came down on one of several selected items and was kept from the list: a
+    // release inside the start box makes it a click after all.
+    bool fClickPending = false;
 };

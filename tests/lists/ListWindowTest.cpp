@@ -3,6 +3,7 @@
 // its handle.
 #include "query/UniverseBuilder.h"
 
+#include "app/ChartReaders.h"
 #include "catalog/TempCatalogue.h"
 #include "controls/ControlWindow.h"
 #include "controls/ControlsOnTwoStars.h"
@@ -21,12 +22,15 @@
 #include "widgets/IButton.h"
 #include "widgets/InfoView.h"
 #include "widgets/WidgetEvents.h"
+#include "widgets/WidgetGeometry.h"
 
 #include "PadOperations.h"
 #include <QDragEnterEvent>
 #include <QDropEvent>
 #include <QItemSelectionModel>
+#include <QLabel>
 #include <QTest>
+#include <algorithm>
 #include <cstring>
 
 #include <gtest/gtest.h>
@@ -123,7 +127,9 @@ TEST_F(ListTest, ANewListWindowAndItsParts)
     EXPECT_TRUE(list->ShowsList());
     EXPECT_EQ(list->Count(), 0);
     EXPECT_EQ(list->countView->text(), "Star Systems: 0");
-    EXPECT_EQ(list->countView->geometry(), QRect(0, 54, 101, 13));
+    EXPECT_EQ(list->countView->geometry().topLeft(), QPoint(0, 54));
+    EXPECT_GE(list->countView->width(), 101);
+    EXPECT_LE(list->countView->geometry().right(), list->showListBox->x() - 1);
     EXPECT_STREQ(list->countView->IGetInfo(), "Star systems in list");
     EXPECT_TRUE(list->showListBox->isChecked());
     EXPECT_EQ(list->showListBox->text(), "Show List");
@@ -226,6 +232,65 @@ TEST_F(ListTest, TheCountLineAfterTwelveSystems)
     EXPECT_EQ(list->countView->text(), "Star Systems: 12");
     EXPECT_EQ(list->listView->model()->rowCount(), 12);
     EXPECT_EQ(list->listView->model()->index(11, 0).data().toString(), "S11");
+}
+
+// The count line as the window draws it: the strip from the left edge to the check box.
+static QImage DrawnCountLine(ListWindow& list)
+{
+    const QRect strip(0, 54, list.showListBox->x(), 13);
+    return list.grab(strip).toImage().convertToFormat(QImage::Format_RGB32);
+}
+
+// What that strip shows when text is drawn whole: a label as wide as the strip, in the count
+// line's font, on the windows' grey.
+static QImage WholeCountLine(ListWindow& list, const QString& text)
+{
+    QWidget back;
+    PaintWindowGrey(&back);
+    back.resize(list.showListBox->x(), 13);
+    QLabel line(text, &back);
+    line.setFont(list.countView->font());
+    line.setGeometry(0, 0, back.width(), 13);
+    return back.grab().toImage().convertToFormat(QImage::Format_RGB32);
+}
+
+TEST(ListCountLine, CountsUpToAMillionShowWhole)
+{
+    InitResources();
+    Universe universe(100000);
+    for (int32_t i = 0; i < 1000000; i++)
+        AddTestSystem(universe, i % 1000, i / 1000, 0, { { "S", "G2V", 4.8 } });
+    RecordingHandler help;
+    ListWindow list(BPoint(140, 140), 230, 340, "Star List", &help, &universe);
+    // Nothing may stand over the line, nor the line over the check box.
+    EXPECT_EQ(list.countView->geometry().topLeft(), QPoint(0, 54));
+    EXPECT_EQ(list.countView->height(), 13);
+    EXPECT_LE(list.countView->geometry().right(), list.showListBox->x() - 1);
+    EXPECT_EQ(list.showListBox->geometry(), QRect(230 - 80, 49, 81, 15));
+    const QFontMetrics metrics(list.countView->font());
+    for (const char* widest : { "Star Systems: 0000000", "Star Systems: 8888888" })
+        EXPECT_LE(metrics.horizontalAdvance(QString::fromLatin1(widest)), list.countView->width());
+
+    StarSysMask set(universe.CountItems(), false, 0);
+    for (const int32_t count : { 285, 261533, 999999 }) {
+        set.SetAll(false);
+        for (int32_t i = 0; i < count; i++)
+            set.SetStateSafe(i, true);
+        Message message(kStarArrayMessage);
+        message.AddPointer(kSystemArrayPtrString, &set);
+        list.Pad("Equals")->MessageReceived(&message);
+        const QString text = QString("Star Systems: %1").arg(count);
+        ASSERT_EQ(list.countView->text(), text);
+        EXPECT_EQ(DifferentPixels(DrawnCountLine(list), WholeCountLine(list, text)), 0) << count;
+    }
+    // The whole universe: NOT of an empty set, dropped on the pad.
+    StarSysMask none(universe.CountItems(), false, 0);
+    Message message(kStarArrayMessage);
+    message.AddPointer(kSystemArrayPtrString, &none);
+    list.Pad("NOT")->MessageReceived(&message);
+    ASSERT_EQ(list.countView->text(), "Star Systems: 1000000");
+    EXPECT_EQ(
+        DifferentPixels(DrawnCountLine(list), WholeCountLine(list, "Star Systems: 1000000")), 0);
 }
 
 TEST_F(ListTest, AnEmptyListIsDraggedAndEmptiesAnotherList)
@@ -337,6 +402,63 @@ TEST_F(ListTest, DraggingFromTheList)
     QCoreApplication::sendEvent(view->viewport(), &move);
     ASSERT_TRUE(caught.has_value());
     EXPECT_EQ(caught->message.FindInt32(kSystemIndexString), 8);
+}
+
+TEST_F(ListTest, SeveralSelectedRowsDraggedWithTheMouseGoTogether)
+{
+    auto list = NewList();
+    Drop(list->Pad("Plus"), SetMessage(Set({ 2, 5, 8, 11, 14 })));
+    StarListView* view = list->listView;
+    QWidget* viewport = view->viewport();
+    std::optional<CaughtDrag> caught;
+    view->SetDragStarter(CatchDrag(caught));
+    auto middle = [&](int row) { return view->visualRect(view->model()->index(row, 0)).center(); };
+    // The pointer moves to where with the left button held.
+    auto moveHeld = [&](QPoint where) {
+        QMouseEvent move(QEvent::MouseMove, QPointF(where), viewport->mapToGlobal(QPointF(where)),
+            Qt::NoButton, Qt::LeftButton, Qt::NoModifier);
+        QCoreApplication::sendEvent(viewport, &move);
+    };
+    // Rows 1, 3 and 4 (systems 5, 11 and 14) picked with Ctrl.
+    for (const int row : { 1, 3, 4 })
+        QTest::mouseClick(viewport, Qt::LeftButton, Qt::ControlModifier, middle(row));
+    auto selectedRows = [&] {
+        std::vector<int> rows;
+        for (const QModelIndex& item : view->selectionModel()->selectedRows())
+            rows.push_back(item.row());
+        std::sort(rows.begin(), rows.end());
+        return rows;
+    };
+    ASSERT_EQ(selectedRows(), (std::vector<int> { 1, 3, 4 }));
+
+    // Pressed on row 3, moved a pixel or two at a time inside the 6-pixel box, then out of it.
+    const QPoint start = middle(3);
+    QTest::mousePress(viewport, Qt::LeftButton, Qt::NoModifier, start);
+    for (const QPoint step : { QPoint(1, 0), QPoint(2, 1), QPoint(4, 2), QPoint(5, 4), QPoint(6, 6),
+             QPoint(3, -5), QPoint(-6, -6) }) {
+        moveHeld(start + step);
+        EXPECT_FALSE(caught.has_value()) << "inside the box at " << step.x() << ", " << step.y();
+        EXPECT_EQ(selectedRows(), (std::vector<int> { 1, 3, 4 }));
+    }
+    moveHeld(start + QPoint(9, 7));
+    ASSERT_TRUE(caught.has_value());
+    QTest::mouseRelease(viewport, Qt::LeftButton, Qt::NoModifier, start + QPoint(9, 7));
+    EXPECT_EQ(caught->message.what, kStarArrayMessage);
+    EXPECT_EQ(caught->pixels, DragPicture(3));
+    EXPECT_EQ(selectedRows(), (std::vector<int> { 1, 3, 4 })) << "the selection survives";
+
+    // Dropped on another list's Equals pad: exactly the three selected systems.
+    auto other = NewList();
+    Drop(other->Pad("Equals"), caught->message);
+    EXPECT_EQ(Members(*other), (std::vector<int32_t> { 5, 11, 14 }));
+
+    // Pressed on a selected row and let go inside the box: a click, that row alone selected.
+    caught.reset();
+    QTest::mousePress(viewport, Qt::LeftButton, Qt::NoModifier, middle(4));
+    moveHeld(middle(4) + QPoint(3, 3));
+    QTest::mouseRelease(viewport, Qt::LeftButton, Qt::NoModifier, middle(4) + QPoint(3, 3));
+    EXPECT_FALSE(caught.has_value());
+    EXPECT_EQ(selectedRows(), (std::vector<int> { 4 }));
 }
 
 TEST_F(ListTest, PadsLightUpUnderADrag)
