@@ -9,11 +9,13 @@
 #include <QSaveFile>
 #include <QStandardPaths>
 
-std::function<QString(QWidget*, const QString&)> SetCsvSaver::chooseFile
-    = [](QWidget* parent, const QString& suggested) {
-          return QFileDialog::getSaveFileName(parent, QStringLiteral("Save Star List as CSV"),
-              suggested, QStringLiteral("CSV files (*.csv);;All files (*)"));
-      };
+std::function<QString(QWidget*, const QString&)> SetCsvSaver::chooseFile = AskForFile;
+
+QString SetCsvSaver::AskForFile(QWidget* parent, const QString& suggested)
+{
+    return QFileDialog::getSaveFileName(parent, QStringLiteral("Save Star List as CSV"), suggested,
+        QStringLiteral("CSV files (*.csv);;All files (*)"));
+}
 
 std::function<void(QWidget*, const QString&)> SetCsvSaver::showError
     = [](QWidget* parent, const QString& text) {
@@ -22,8 +24,10 @@ std::function<void(QWidget*, const QString&)> SetCsvSaver::showError
 
 QString SetCsvSaver::SuggestedPath()
 {
+    // The documents folder is named whether or not it exists; a dialog told of a folder that
+    // does not exist opens in the current one instead, so it is made here when missing.
     QString folder = QStandardPaths::writableLocation(QStandardPaths::DocumentsLocation);
-    if (folder.isEmpty())
+    if (folder.isEmpty() || !QDir().mkpath(folder))
         folder = QDir::homePath();
     return QDir(folder).filePath(QStringLiteral("stars.csv"));
 }

@@ -16,6 +16,9 @@ public:
     // Asks for the file, offered suggested; an empty answer cancels. By default a native save
     // dialog over parent.
     static std::function<QString(QWidget* parent, const QString& suggested)> chooseFile;
+    // The default: a save dialog over parent, standing in suggested's folder with its file
+    // name filled in.
+    static QString AskForFile(QWidget* parent, const QString& suggested);
     // Tells of a failure; by default a warning box over parent.
     static std::function<void(QWidget* parent, const QString& text)> showError;
 

@@ -22,15 +22,20 @@
 
 #include "PadOperations.h"
 #include <QAction>
+#include <QApplication>
 #include <QContextMenuEvent>
 #include <QDragEnterEvent>
 #include <QDropEvent>
 #include <QFile>
+#include <QFileDialog>
+#include <QFileInfo>
 #include <QLineEdit>
 #include <QMenu>
 #include <QMimeData>
+#include <QStandardPaths>
 #include <QTemporaryDir>
 #include <QTest>
+#include <QTimer>
 #include <QUrl>
 
 #include <gtest/gtest.h>
@@ -292,6 +297,52 @@ TEST_F(ListCsvTest, SaveFailureIsReportedAndLeavesNothingBehind)
         << errors[0].toStdString();
     EXPECT_GT(errors[0].size(), (QStringLiteral("Could not write ") + chosenPath + ": ").size());
     EXPECT_FALSE(QFile::exists(chosenPath));
+}
+
+TEST_F(ListCsvTest, TheSaveDialogOpensInTheDocumentsFolder)
+{
+    // A user whose documents folder has not been made yet.
+    QTemporaryDir home;
+    ASSERT_TRUE(home.isValid());
+    const QByteArray oldHome = qgetenv("HOME"), oldConfig = qgetenv("XDG_CONFIG_HOME");
+    qputenv("HOME", home.path().toUtf8());
+    qputenv("XDG_CONFIG_HOME", home.filePath(QStringLiteral(".config")).toUtf8());
+    const QString documents = QStandardPaths::writableLocation(QStandardPaths::DocumentsLocation);
+    ASSERT_EQ(documents, home.filePath(QStringLiteral("Documents")));
+    ASSERT_FALSE(QFileInfo::exists(documents));
+
+    Universe universe(20);
+    AddTestSystem(universe, 1, 2, 3, { { "Only", "G2V", 4.8 } });
+    auto list = NewList(&universe);
+    Fill(list.get(), { 0 });
+    // The real dialog: once it is up, where it stands is noted and it is cancelled.
+    SetCsvSaver::chooseFile = SetCsvSaver::AskForFile;
+    QString shownFolder, shownFile;
+    int ticks = 0;
+    QTimer watch;
+    watch.setInterval(10);
+    QObject::connect(&watch, &QTimer::timeout, [&] {
+        QWidget* modal = QApplication::activeModalWidget();
+        if (auto* dialog = qobject_cast<QFileDialog*>(modal)) {
+            shownFolder = dialog->directory().absolutePath();
+            shownFile = dialog->selectedFiles().value(0);
+            dialog->reject();
+        } else if (modal && ++ticks > 1000) {
+            modal->close();
+        }
+    });
+    watch.start();
+    EXPECT_FALSE(list->SaveAsCsv());
+    watch.stop();
+    qputenv("HOME", oldHome);
+    if (oldConfig.isNull())
+        qunsetenv("XDG_CONFIG_HOME");
+    else
+        qputenv("XDG_CONFIG_HOME", oldConfig);
+
+    EXPECT_EQ(shownFolder.toStdString(), documents.toStdString());
+    EXPECT_EQ(shownFile.toStdString(), (documents + "/stars.csv").toStdString());
+    EXPECT_TRUE(errors.isEmpty());
 }
 
 TEST_F(ListCsvTest, HelpNamesTheKey)
