@@ -4,6 +4,7 @@
 #include <algorithm>
 #include <charconv>
 #include <clocale>
+#include <cstdarg>
 #include <cstdio>
 #include <cstring>
 #include <locale.h>
@@ -75,6 +76,16 @@ int FormatDouble(char* buffer, size_t size, const char* format, double value)
 {
     CLocaleScope locale;
     return std::snprintf(buffer, size, format, value);
+}
+
+int FormatCLocale(char* buffer, size_t size, const char* format, ...)
+{
+    CLocaleScope locale;
+    va_list arguments;
+    va_start(arguments, format);
+    const int written = std::vsnprintf(buffer, size, format, arguments);
+    va_end(arguments);
+    return written;
 }
 
 int ScanCatalogueData(const char* line, const char* end, char* classText, double* magnitude,

@@ -22,6 +22,11 @@ bool ScanDouble(const char* text, double* value, const char** next = nullptr);
 // one conversion of a double.
 int FormatDouble(char* buffer, size_t size, const char* format, double value);
 
+// snprintf(buffer, size, format, ...) in the "C" locale: for texts of several numbers shown to
+// the user, which read the same whatever the user's locale.
+int FormatCLocale(char* buffer, size_t size, const char* format, ...)
+    __attribute__((format(printf, 3, 4)));
+
 // The fields of a catalogue data line, as sscanf(line, "%s %lf %lf %lf %lf") would fill them.
 // classText must hold 501 bytes; line is NUL-terminated or ends at end, whichever comes first,
 // and is at most 500 characters long. Fields that are not read keep their values. Returns

@@ -2,6 +2,7 @@
 // and dragging systems in and out.
 #include "hrd/HRDView.h"
 
+#include "catalog/CNumbers.h"
 #include "catalog/Star.h"
 #include "catalog/StarSystem.h"
 #include "core/MessageCodes.h"
@@ -12,6 +13,7 @@
 #include <QDropEvent>
 #include <QMouseEvent>
 #include <QPainter>
+#include <cmath>
 #include <cstdio>
 #include <cstdlib>
 #include <cstring>
@@ -24,6 +26,13 @@ constexpr int32_t kSystemArrayImageId = 3; // 'Raw8': the drag image of a set
 constexpr int32_t kMarkerId = 4; // 'Raw8': the 8 x 8 marker
 constexpr int32_t kMarkerSize = 8;
 constexpr float kMarkerReach = 3; // a marker is found this far from its centre, either way
+
+// Whether a diagram coordinate converts to an integer pixel: finite, and well inside the range
+// of the integers the drawing takes (pixels, however far off the diagram).
+bool HasPixel(float coordinate)
+{
+    return std::isfinite(coordinate) && std::fabs(coordinate) < 1.0e6f;
+}
 
 } // namespace
 
@@ -92,7 +101,10 @@ void HRDView::AddPlot(long systemIndex)
         // Full: the last slot stays the newest star's.
         if (plotCount < kMaxPlots - 1)
             plotCount++;
-        RenderPlot(long(x), long(y));
+        // A magnitude that is no number, or absurdly far off, has no pixel to truncate to: the
+        // plot is kept, as one off the diagram is, but there is nothing to draw.
+        if (HasPixel(x) && HasPixel(y))
+            RenderPlot(long(x), long(y));
     }
 }
 
@@ -181,17 +193,17 @@ void HRDView::MouseMoved(QPoint where, Transit transit)
         hoverIndex = hovered;
         if (!plot) {
             plotNameInfo->IClearInfo();
-            ISetInfo(plotCount == 0 ? "Drag & drop stars from other views here"
-                                    : "Click to drag & drop all stars");
+            SetHelp(plotCount == 0 ? "Drag & drop stars from other views here"
+                                   : "Click to drag & drop all stars");
             return;
         }
         const SpectralClass* sc = plot->star->GetSpectralClass();
         char text[256];
-        std::snprintf(text, sizeof text, "%s ( %.1f %c%1.1f )", plot->star->GetName(),
+        FormatCLocale(text, sizeof text, "%s ( %.1f %c%1.1f )", plot->star->GetName(),
             plot->star->GetMagnitude(), sc->GetHCCharacter(), sc->GetDecimalClass());
         plotNameInfo->ISetInfo(text);
         plotNameInfo->IBroadcastInfo();
-        ISetInfo("Click to drag & drop star");
+        SetHelp("Click to drag & drop star");
         break;
     }
     case B_EXITED_VIEW:
@@ -204,6 +216,16 @@ void HRDView::MouseMoved(QPoint where, Transit transit)
     default:
         break;
     }
+}
+
+void HRDView::SetHelp(const char* text)
+{
+    // The help line shows what the mouse is over now: on the first entry the view's text is not
+    // yet chosen when the entry broadcasts it, so each change is broadcast as it is made.
+    if (std::strcmp(IGetInfo(), text) == 0)
+        return;
+    ISetInfo(text);
+    IBroadcastInfo();
 }
 
 void HRDView::mousePressEvent(QMouseEvent* event)

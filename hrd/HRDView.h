@@ -73,6 +73,8 @@ protected:
 private:
     // Shows the canvas now.
     void DrawCanvas();
+    // Makes text the view's help and puts it on the help line, unless it is the help already.
+    void SetHelp(const char* text);
 
     RBitmap8* background; // the empty diagram; owned
     RBitmap8* canvas; // the diagram with the markers, what is shown; owned

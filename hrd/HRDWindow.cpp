@@ -8,6 +8,8 @@
 #include "widgets/InfoView.h"
 #include "widgets/WidgetGeometry.h"
 
+#include <QPointer>
+
 namespace {
 
 constexpr int kWidth = 300, kHeight = 308; // the diagram and the 12-pixel strip below it
@@ -48,8 +50,21 @@ HRDWindow::HRDWindow(BPoint where, const char* title, QObject* infoTarget)
 
 void HRDWindow::FollowSelection(QObject* chartView)
 {
-    Message subscribe(kStarInfoSubscribe);
-    subscribe.AddPointer(kSIHandlerPtrString, static_cast<QObject*>(fView));
-    subscribe.AddInt32(kSIFlagsString, kSISelectionChanged | kSIWithSelection);
-    PostMessage(chartView, subscribe);
+    // The subscription names the diagram by pointer. It waits in the chart's queue, and this
+    // window may close meanwhile: only a guard travels, and the pointer is written into the
+    // message when it is delivered, if the diagram is still there.
+    if (!chartView)
+        return;
+    QMetaObject::invokeMethod(
+        chartView,
+        [chart = QPointer<QObject>(chartView), view = QPointer<HRDView>(fView)] {
+            auto* handler = dynamic_cast<BHandler*>(chart.data());
+            if (!handler || !view)
+                return;
+            Message subscribe(kStarInfoSubscribe);
+            subscribe.AddPointer(kSIHandlerPtrString, static_cast<QObject*>(view.data()));
+            subscribe.AddInt32(kSIFlagsString, kSISelectionChanged | kSIWithSelection);
+            handler->MessageReceived(&subscribe);
+        },
+        Qt::QueuedConnection);
 }

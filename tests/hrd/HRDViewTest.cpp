@@ -458,3 +458,16 @@ TEST_F(HRDViewTest, SetsAndSystemsDroppedByDragArePlotted)
     QCoreApplication::sendEvent(view.get(), &foreign);
     EXPECT_FALSE(foreign.isAccepted());
 }
+
+TEST_F(HRDViewTest, AMagnitudeThatIsNoNumberOrAbsurdIsKeptButNotDrawn)
+{
+    Universe sky(4);
+    AddTestSystem(sky, 1, 0, 0,
+        { { "Not A Number", "G2V", std::nan("") }, { "Endless", "K0V", HUGE_VAL },
+            { "Boundless", "K0V", -HUGE_VAL }, { "Absurd", "M0V", 4.0e8 } });
+    SendUniverse(&sky);
+    Send(kStarMessage, kSystemIndexString, 0);
+    EXPECT_EQ(view->PlotCount(), 4);
+    EXPECT_TRUE(CanvasIsEmpty());
+    EXPECT_EQ(view->FindPlot(BPoint(150, 150)), nullptr);
+}

@@ -2,6 +2,8 @@
 // and the control window's button that opens it.
 #include "chart/ChartFixture.h"
 
+#include "CommaLocale.h"
+
 #include "controls/ControlWindow.h"
 #include "controls/ControlsOnTwoStars.h"
 #include "core/MessageCodes.h"
@@ -149,6 +151,66 @@ TEST_F(HRDWindowTest, SelectingOnAFollowedChartPlotsTheSelection)
     ASSERT_EQ(chart->subscribers.CountItems(), 1);
     EXPECT_EQ(
         static_cast<const SISubscriber*>(chart->subscribers.ItemAt(0))->handler, next->View());
+}
+
+TEST_F(HRDWindowTest, TheFirstEntryPutsTheDiagramsHelpOnTheHelpLine)
+{
+    InfoView helpLine(BRect(0, 0, 299, 11), "Info View", "");
+    Universe* universe = MakeUniverse({ { "The Sun", 0, 0, 0, 4.83 } });
+    HRDWindow window(BPoint(150, 150), "H-R Diagram", &helpLine);
+    SendUniverse(&window, universe);
+    HRDView* view = window.View();
+
+    // In from the left edge, as a hand moves the mouse: the diagram is empty, and says how to
+    // fill it.
+    Enter(view);
+    for (int x = 2; x <= 40; x += 6)
+        MoveMouse(view, QPoint(x, 200));
+    EXPECT_EQ(helpLine.text(), "Drag & drop stars from other views here");
+    Leave(view);
+    DeliverPostedMessages();
+    EXPECT_EQ(helpLine.text(), "");
+
+    // With a star plotted, the help over empty space offers them all.
+    Message star(kStarMessage);
+    star.AddInt32(kSystemIndexString, 0);
+    view->MessageReceived(&star);
+    Enter(view);
+    MoveMouse(view, QPoint(2, 200));
+    MoveMouse(view, QPoint(8, 200));
+    EXPECT_EQ(helpLine.text(), "Click to drag & drop all stars");
+}
+
+TEST_F(HRDWindowTest, ThePlotNameLineWritesNumbersWithAPointInADecimalCommaLocale)
+{
+    // The catalogue is written before the locale changes: it is read as a file of the program.
+    HRDWindow* window = WindowWithVega();
+    const CommaLocale comma;
+    ASSERT_TRUE(comma.Active()) << "the de_DE.UTF-8 locale is missing: run scripts/setup";
+    const HRPlot& plot = window->View()->Plots()[0];
+    Enter(window->View());
+    MoveMouse(window->View(), QPoint(int(plot.x) - 8, int(plot.y)));
+    MoveMouse(window->View(), QPoint(int(plot.x), int(plot.y)));
+    EXPECT_EQ(window->PlotName()->text(), "Vega ( 0.6 A0.0 )");
+}
+
+TEST_F(HRDWindowTest, AWindowClosedBeforeTheChartGetsItsSubscriptionIsNotSubscribed)
+{
+    Universe* universe = MakeUniverse({ { "The Sun", 0, 0, 0, 4.83 },
+        { "Vega", 1, 4, -5, 0.58, "A0V" }, { "Sirius", -0.5, -0.8, 2.5, 1.43, "A1V" } });
+    UniverseView* chart = MakeView(universe);
+    auto window = std::make_unique<HRDWindow>(BPoint(150, 150), "H-R Diagram", &help);
+    window->FollowSelection(chart);
+    // Closed while the request still waits in the chart's queue.
+    window.reset();
+    DeliverPostedMessages();
+    EXPECT_EQ(chart->subscribers.CountItems(), 0);
+
+    // The chart's next selection goes nowhere.
+    chart->mouseInside = true;
+    chart->UpdateData(2, 1);
+    DeliverPostedMessages();
+    EXPECT_EQ(chart->subscribers.CountItems(), 0);
 }
 
 TEST(HRDFromControlWindow, TheButtonOpensADiagramThatFollowsEveryChart)
