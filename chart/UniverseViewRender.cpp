@@ -4,9 +4,11 @@
 #include "core/CCoord.h"
 #include "core/ShownCoord.h"
 #include "core/Truncate.h"
+#include "render/AsciiText.h"
 
 #include <cmath>
 #include <cstdio>
+#include <string>
 
 namespace {
 
@@ -138,11 +140,12 @@ std::string UniverseView::FormatReadout() const
     view.z = -view.z;
     const ShownCoord c { CCoord(view) };
     const StarSystem* origin = universe ? universe->SystemAt(originSystem) : nullptr;
+    // Drawn with the bitmap font, which has ASCII only: the name is spelled in ASCII.
+    const std::string name = origin ? AsciiTransliteration(origin->GetName()) : std::string();
     char text[256] = {};
     std::snprintf(text, sizeof text,
-        "Origin: %s\nDistance: %.2f\nRA: %.0fh %.1fm\nDEC: %+.0fd %.1f'\n",
-        origin ? origin->GetName() : "", cameraDistance, c.raHours, c.raMinutes, c.decDegrees,
-        c.decMinutes);
+        "Origin: %s\nDistance: %.2f\nRA: %.0fh %.1fm\nDEC: %+.0fd %.1f'\n", name.c_str(),
+        cameraDistance, c.raHours, c.raMinutes, c.decDegrees, c.decMinutes);
     return text;
 }
 

@@ -1,8 +1,10 @@
 // The chart's pictures and camera, checked pixel by pixel on small universes.
 #include "ChartFixture.h"
+#include "app/ChartReaders.h"
 
 #include "catalog/Star.h"
 #include "core/Constants.h"
+#include "platform/qt/BitmapImage.h"
 
 #include <cmath>
 #include <string>
@@ -248,6 +250,19 @@ TEST_F(ChartTest, TheReadOutNamesTheOriginAndDistance)
             ink += Pixel(view, x, y) == 55;
     }
     EXPECT_GT(ink, 200);
+}
+
+TEST_F(ChartTest, AnOriginNamedWithAccentsIsDrawnInAsciiLettersNotGaps)
+{
+    // A star named with accents ("B\u00e9l\u00e9nos", HD 8574), written in UTF-8.
+    Universe* u = MakeUniverse({ { "B\xc3\xa9l\xc3\xa9nos", 0, 0, 0, 4.7 } });
+    UniverseView* view = MakeView(u, 1, kChartWidth);
+    view->Render();
+    // The read-out as drawn, glyph by glyph in the program's font.
+    const QImage drawn = ImageOf(*view->Offscreen());
+    const QRect area = ReadOutReader::Area(QPoint(0, 0));
+    const std::string text = ReadOutReader().Read(drawn, area.topLeft());
+    EXPECT_EQ(text.substr(0, text.find('\n')), "Origin: Belenos") << text;
 }
 
 TEST_F(ChartTest, TheReadOutPutsNoMinusSignOnAZero)
