@@ -1,8 +1,13 @@
 // The help page and the window that shows it.
 #include "controls/HelpWindow.h"
 
+#include <QGuiApplication>
 #include <QLabel>
+#include <QScreen>
+#include <QScrollArea>
+#include <QScrollBar>
 #include <QVBoxLayout>
+#include <algorithm>
 
 namespace {
 
@@ -70,16 +75,55 @@ HelpWindow::HelpWindow(BPoint where)
 {
     setAttribute(Qt::WA_DeleteOnClose);
     setWindowTitle("Nightdome Help");
-    move(int(where.x), int(where.y));
 
-    auto* page = new QLabel(QString::fromUtf8(kHelpText), this);
+    auto* page = new QLabel(QString::fromUtf8(kHelpText));
     page->setObjectName("Help Text");
     page->setTextFormat(Qt::RichText);
     page->setWordWrap(true);
     page->setTextInteractionFlags(Qt::TextSelectableByMouse);
-    page->setFixedWidth(520);
+    // 520 pixels of text between the margins.
+    page->setContentsMargins(16, 8, 16, 16);
+    page->setFixedWidth(520 + 32);
+    page->setFixedHeight(page->heightForWidth(page->width()));
+
+    // The page scrolls, so that the window can be smaller than the page on a small screen or at
+    // a large scale factor.
+    auto* scroller = new QScrollArea(this);
+    scroller->setObjectName("Help Scroller");
+    scroller->setFrameShape(QFrame::NoFrame);
+    scroller->setHorizontalScrollBarPolicy(Qt::ScrollBarAlwaysOff);
+    scroller->setWidget(page);
     auto* layout = new QVBoxLayout(this);
-    layout->setContentsMargins(16, 8, 16, 16);
-    layout->addWidget(page);
-    layout->setSizeConstraint(QLayout::SetFixedSize);
+    layout->setContentsMargins(0, 0, 0, 0);
+    layout->addWidget(scroller);
+
+    FitToScreen(QPoint(int(where.x), int(where.y)));
+}
+
+void HelpWindow::FitToScreen(QPoint where)
+{
+    QScreen* screen = QGuiApplication::screenAt(where);
+    if (!screen)
+        screen = QGuiApplication::primaryScreen();
+    QWidget* page = findChild<QLabel*>("Help Text");
+    auto* scroller = findChild<QScrollArea*>("Help Scroller");
+    const int barWidth = scroller->verticalScrollBar()->sizeHint().width();
+    // The whole page, with room for the scroll bar in case it is needed after all.
+    QSize wanted(page->width() + barWidth, page->height());
+    if (!screen) {
+        resize(wanted);
+        move(where);
+        return;
+    }
+    // The window manager's frame takes some of the screen too; an unshown window does not know
+    // its frame yet, so leave room for a title bar and borders of common size.
+    const QRect available = screen->availableGeometry();
+    constexpr int kFrameWidth = 8, kFrameHeight = 40;
+    const QSize room(available.width() - kFrameWidth, available.height() - kFrameHeight);
+    const QSize size = wanted.boundedTo(room);
+    resize(size);
+    // Kept inside the free area, the right and bottom edges first.
+    const int x = std::min(where.x(), available.right() + 1 - size.width() - kFrameWidth);
+    const int y = std::min(where.y(), available.bottom() + 1 - size.height() - kFrameHeight);
+    move(std::max(x, available.left()), std::max(y, available.top()));
 }
