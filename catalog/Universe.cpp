@@ -26,29 +26,41 @@ constexpr size_t kMaxName = 79;
 // line feed).
 constexpr size_t kMaxRecord = 2 * (kMaxLine + 2);
 
+// One line of the catalogue text: where its characters stand, how many were taken, and whether
+// the line went on past them (so that its rest is read as the next line).
+struct CatalogueLine {
+    const char* text;
+    size_t length;
+    bool split;
+};
+
 // The catalogue text seen through a sliding window that always holds a whole record when the
 // file has one left.
 class CatalogueText {
 public:
-    CatalogueText(std::FILE* file, size_t window)
+    CatalogueText(std::FILE* file, size_t window, const CatalogueProgress& progress)
         : fFile(file)
         , fBuffer(window + kMaxRecord)
+        , fProgress(progress)
     {
         std::setvbuf(file, nullptr, _IONBF, 0);
     }
 
-    // True while the read position is inside the text.
+    // True while the read position is inside the text, and the text is text.
     bool More()
     {
-        if (!fEnded && fLimit - fPosition < kMaxRecord)
+        if (!fEnded && !fBinary && fLimit - fPosition < kMaxRecord)
             Refill();
-        return fPosition < fLimit;
+        return !fBinary && fPosition < fLimit;
     }
+
+    // Whether a NUL byte has been read: no text holds one.
+    bool Binary() const { return fBinary; }
 
     // The next line: its characters up to the line feed, at most kMaxLine of them; the read
     // position then steps over one more character. A carriage return before the line feed
     // belongs to the line end, so catalogues written with CR LF read as with LF alone.
-    std::pair<const char*, size_t> Line()
+    CatalogueLine Line()
     {
         const char* start = fBuffer.data() + std::min(fPosition, fLimit);
         const size_t left = fPosition < fLimit ? fLimit - fPosition : 0;
@@ -56,6 +68,7 @@ public:
         const void* feed = std::memchr(start, '\n', available);
         size_t length = feed ? static_cast<const char*>(feed) - start : available;
         size_t step = length + 1;
+        bool split = false;
         if (feed || (length < left && start[length] == '\n')) {
             // A line of at most kMaxLine characters before its line feed.
             if (length > 0 && start[length - 1] == '\r')
@@ -63,9 +76,13 @@ public:
         } else if (length + 1 < left && start[length] == '\r' && start[length + 1] == '\n') {
             // kMaxLine characters, then CR LF: one line end, not a split line.
             step++;
+        } else {
+            // Longer than kMaxLine, unless the text ends here: the next character is dropped
+            // and what follows it is read as the next line.
+            split = length < left;
         }
         fPosition += step;
-        return { start, length };
+        return { start, length, split };
     }
 
 private:
@@ -78,18 +95,42 @@ private:
         while (!fEnded && fLimit < fBuffer.size()) {
             const size_t got
                 = std::fread(fBuffer.data() + fLimit, 1, fBuffer.size() - fLimit, fFile);
+            if (std::memchr(fBuffer.data() + fLimit, '\0', got))
+                fBinary = true;
             fLimit += got;
+            fRead += got;
             if (got == 0)
                 fEnded = true;
         }
+        if (fProgress)
+            fProgress(fRead);
     }
 
     std::FILE* fFile;
     std::vector<char> fBuffer;
+    const CatalogueProgress& fProgress;
     size_t fPosition = 0;
     size_t fLimit = 0;
+    uint64_t fRead = 0; // bytes read from the file
     bool fEnded = false;
+    bool fBinary = false;
 };
+
+// Notes a record with a problem of one kind: one more, and the line of the first.
+void Count(int64_t* records, int64_t* firstLine, int64_t line)
+{
+    if ((*records)++ == 0)
+        *firstLine = line;
+}
+
+// Reads a number that is not finite as 0, as one that cannot be read reads; true when it was.
+bool ZeroIfNotFinite(double* value)
+{
+    if (std::isfinite(*value))
+        return false;
+    *value = 0;
+    return true;
+}
 
 std::filesystem::path CataloguePath(const char* fileName)
 {
@@ -114,9 +155,12 @@ Universe::Universe(int32_t blockSize)
 {
 }
 
-bool ReadCatalogue(std::FILE* file, int32_t maxStars, Universe* universe, size_t window)
+bool ReadCatalogue(std::FILE* file, int32_t maxStars, Universe* universe, size_t window,
+    CatalogueReport* report, const CatalogueProgress& progress)
 {
-    CatalogueText text(file, window);
+    CatalogueText text(file, window, progress);
+    CatalogueReport met;
+    const int32_t before = universe->CountItems();
     // The scan targets live across records: a line with fewer fields keeps the values the
     // record before it had.
     char classText[kMaxLine + 1] = "";
@@ -125,15 +169,38 @@ bool ReadCatalogue(std::FILE* file, int32_t maxStars, Universe* universe, size_t
     char name[kMaxName + 1];
     StarSystem* system = nullptr;
 
+    int64_t line = 1; // of the file, where the next line starts
     int32_t records = 0;
     for (; records < maxStars && text.More(); records++) {
-        const auto [nameLine, nameLength] = text.Line();
-        const size_t kept = std::min(nameLength, kMaxName);
-        std::memcpy(name, nameLine, kept);
+        const CatalogueLine nameLine = text.Line();
+        const int64_t nameAt = line;
+        line += nameLine.split ? 0 : 1;
+        const size_t kept = std::min(nameLine.length, kMaxName);
+        std::memcpy(name, nameLine.text, kept);
         name[kept] = '\0';
 
-        const auto [dataLine, dataLength] = text.Line();
-        ScanCatalogueData(dataLine, dataLine + dataLength, classText, &magnitude, &x, &y, &z);
+        const CatalogueLine dataLine = text.Line();
+        const int64_t dataAt = line;
+        line += dataLine.split ? 0 : 1;
+        const int fields = ScanCatalogueData(
+            dataLine.text, dataLine.text + dataLine.length, classText, &magnitude, &x, &y, &z);
+
+        if (nameLine.split || dataLine.split || fields < 5) {
+            if (met.malformed == 0)
+                met.cause = nameLine.split ? CatalogueReport::kLongName
+                    : dataLine.split       ? CatalogueReport::kLongData
+                                           : CatalogueReport::kMissingFields;
+            Count(&met.malformed, &met.malformedLine, nameLine.split ? nameAt : dataAt);
+        }
+        // Every number not finite is read as 0, not only the first.
+        const int zeroed = int(ZeroIfNotFinite(&magnitude)) + int(ZeroIfNotFinite(&x))
+            + int(ZeroIfNotFinite(&y)) + int(ZeroIfNotFinite(&z));
+        if (zeroed > 0)
+            Count(&met.nonFinite, &met.nonFiniteLine, dataAt);
+        if (std::fabs(x) > kFarthestCatalogueStar || std::fabs(y) > kFarthestCatalogueStar
+            || std::fabs(z) > kFarthestCatalogueStar
+            || std::fabs(magnitude) > kBrightestCatalogueMagnitude)
+            Count(&met.outOfRange, &met.outOfRangeLine, dataAt);
 
         auto* star = new Star(name, classText, magnitude, 1);
         // A first record at the sentinel position still opens a system of its own.
@@ -146,7 +213,17 @@ bool ReadCatalogue(std::FILE* file, int32_t maxStars, Universe* universe, size_t
         }
         system->AddItem(star);
     }
-    return records >= maxStars && text.More();
+    const bool cut = records >= maxStars && text.More();
+    if (text.Binary()) {
+        // Not a catalogue: nothing of it stays.
+        while (universe->CountItems() > before)
+            delete static_cast<StarSystem*>(universe->RemoveItem(universe->CountItems() - 1));
+        met = CatalogueReport();
+        met.notText = true;
+    }
+    if (report)
+        *report = met;
+    return cut && !met.notText;
 }
 
 Universe::Universe(const char* fileName, int32_t maxStars, int32_t blockSize)

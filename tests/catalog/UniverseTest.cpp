@@ -7,10 +7,12 @@
 
 #include <gtest/gtest.h>
 
+#include <algorithm>
 #include <cmath>
 #include <cstdio>
 #include <memory>
 #include <string>
+#include <vector>
 
 namespace {
 
@@ -466,4 +468,194 @@ TEST_F(UniverseTest, ReadingSaysWhenItStoppedAtTheLimit)
     EXPECT_EQ(three.CountItems(), 2);
     EXPECT_FALSE(read(1000000, &more));
     EXPECT_EQ(more.CountItems(), 2);
+}
+
+namespace {
+
+// Reads text through the reader with a window of window bytes and returns what it reported.
+CatalogueReport ReadText(const std::string& text, Universe* universe,
+    size_t window = kCatalogueWindow, int32_t maxStars = 1000000)
+{
+    std::string copy = text;
+    std::unique_ptr<std::FILE, int (*)(std::FILE*)> in(
+        fmemopen(copy.data(), copy.size(), "rb"), &std::fclose);
+    CatalogueReport report;
+    report.malformed = -1; // overwritten by every reading
+    ReadCatalogue(in.get(), maxStars, universe, window, &report);
+    return report;
+}
+
+// n records "Star i" at (i, 0, 0).
+std::string GoodRecords(int first, int n)
+{
+    std::string text;
+    for (int i = first; i < first + n; i++)
+        text += "Star " + std::to_string(i) + "\nG2V 4.8 " + std::to_string(i) + " 0 0\n";
+    return text;
+}
+
+} // namespace
+
+TEST_F(UniverseTest, AWellMadeCatalogueReportsNothing)
+{
+    Universe u(5000);
+    const CatalogueReport report = ReadText(GoodRecords(1, 20), &u);
+    EXPECT_EQ(u.CountItems(), 20);
+    EXPECT_TRUE(report.Clean());
+    EXPECT_EQ(report, CatalogueReport());
+}
+
+TEST_F(UniverseTest, AFileHoldingNulBytesIsNoCatalogue)
+{
+    // A program's first bytes: without the refusal its first system would be named "\x7f" "ELF".
+    std::string elf("\x7f"
+                    "ELF\x02\x01\x01",
+        7);
+    elf += std::string(9, '\0') + "\x03 stuff\nmore\n";
+    Universe program(5000);
+    CatalogueReport report = ReadText(elf, &program);
+    EXPECT_TRUE(program.IsEmpty());
+    EXPECT_TRUE(report.notText);
+    EXPECT_FALSE(report.Clean());
+
+    // Zeros only: without the refusal every 1002 of them would be a phantom star.
+    Universe zeros(5000);
+    report = ReadText(std::string(200000, '\0'), &zeros, 4096);
+    EXPECT_TRUE(zeros.IsEmpty());
+    EXPECT_TRUE(report.notText);
+
+    // Good records first, one NUL far behind them and beyond the first window: still refused,
+    // and what was read before it is taken out again.
+    Universe late(5000);
+    const std::string good = GoodRecords(1, 3000);
+    report = ReadText(good + std::string(1, '\0') + "\n", &late, 4096);
+    EXPECT_TRUE(late.IsEmpty());
+    EXPECT_TRUE(report.notText);
+
+    // Systems already in the universe stay.
+    Universe kept(5000);
+    ReadText(GoodRecords(1, 2), &kept);
+    report = ReadText(std::string("A\nG2 1 1 1 1\0", 13), &kept);
+    EXPECT_TRUE(report.notText);
+    EXPECT_EQ(kept.CountItems(), 2);
+
+    // The constructor reading a file by its name refuses it the same way.
+    const TempCatalogue file(elf);
+    const Universe named(file.PathString().c_str(), 1000000, 5000);
+    EXPECT_TRUE(named.IsEmpty());
+}
+
+TEST_F(UniverseTest, ANameLongerThanALineIsReportedWithTheRecordsItShifts)
+{
+    // Two good records, a name of 5000 characters on line 5, then three records more.
+    const std::string text
+        = GoodRecords(1, 2) + std::string(5000, 'N') + "\nG2V 4.8 3 0 0\n" + GoodRecords(4, 3);
+    Universe u(5000);
+    const CatalogueReport report = ReadText(text, &u);
+    EXPECT_EQ(report.malformedLine, 5);
+    EXPECT_EQ(report.cause, CatalogueReport::kLongName);
+    // Read as ever: the long line gives ten pieces of 500 characters (each followed by a
+    // dropped one) read as name, data, name, ..., and then every later line pairs with the one
+    // after it, so that no record from line 5 on is whole: 5 from the long line, 4 after it.
+    EXPECT_EQ(report.malformed, 9);
+    EXPECT_EQ(report.nonFinite, 0);
+    ASSERT_GE(u.CountItems(), 2);
+    EXPECT_STREQ(u.SystemAt(1)->GetName(), "Star 2");
+    EXPECT_EQ(std::string(u.SystemAt(1)->StarAt(1)->GetName()), std::string(79, 'N'));
+    // A data line as name: the shift reads "Star 4" as a class.
+    const StarSystem* last = u.SystemAt(u.CountItems() - 1);
+    EXPECT_STREQ(last->StarAt(last->CountItems() - 1)->GetSpectralClassString(), "Star");
+}
+
+TEST_F(UniverseTest, ADataLineLongerThanALineAndMissingFieldsAreReported)
+{
+    Universe longData(5000);
+    CatalogueReport report = ReadText(GoodRecords(1, 1) + "Long\nG2V 1 2 3 4"
+            + std::string(600, ' ') + "x\n" + "Next\nK2 1 1 1 1\n",
+        &longData);
+    EXPECT_EQ(report.cause, CatalogueReport::kLongData);
+    EXPECT_EQ(report.malformedLine, 4);
+    EXPECT_GE(report.malformed, 1);
+
+    // A data line with three fields on line 4 and an empty one on line 8.
+    Universe missing(5000);
+    report = ReadText(
+        GoodRecords(1, 1) + "Short\nM4 11.2 7\n" + GoodRecords(2, 1) + "Empty\n\n", &missing);
+    EXPECT_EQ(report.cause, CatalogueReport::kMissingFields);
+    EXPECT_EQ(report.malformedLine, 4);
+    EXPECT_EQ(report.malformed, 2);
+    // Still read as ever: the missing fields keep the record before's values.
+    ASSERT_EQ(missing.CountItems(), 3);
+    EXPECT_EQ(missing.SystemAt(1)->position.y, 0);
+}
+
+TEST_F(UniverseTest, NumbersThatAreNotFiniteReadAsZero)
+{
+    const std::string text = GoodRecords(1, 1) + "Nan\nG2V nan 1 2 3\n" + "Inf\nK0 1 inf 5 6\n"
+        + "Huge\nM0 2 7 1e400 -INFINITY\n" + GoodRecords(5, 1);
+    Universe u(5000);
+    const CatalogueReport report = ReadText(text, &u);
+    EXPECT_EQ(report.nonFinite, 3);
+    EXPECT_EQ(report.nonFiniteLine, 4);
+    EXPECT_EQ(report.malformed, 0);
+    ASSERT_EQ(u.CountItems(), 5);
+    EXPECT_EQ(u.SystemAt(1)->StarAt(0)->magnitude, 0);
+    EXPECT_EQ(u.SystemAt(1)->luminosity, SolarLuminosity(0));
+    EXPECT_EQ(u.SystemAt(2)->position.x, 0);
+    EXPECT_EQ(u.SystemAt(2)->position.y, 5);
+    EXPECT_EQ(u.SystemAt(3)->position.x, 7);
+    EXPECT_EQ(u.SystemAt(3)->position.y, 0);
+    EXPECT_EQ(u.SystemAt(3)->position.z, 0);
+    for (int32_t i = 0; i < u.CountItems(); i++) {
+        EXPECT_TRUE(std::isfinite(u.SystemAt(i)->luminosity)) << i;
+        EXPECT_TRUE(std::isfinite(u.SystemAt(i)->position.Magnitude())) << i;
+    }
+}
+
+TEST_F(UniverseTest, NumbersFarOutOfRangeAreKeptAndReported)
+{
+    const std::string text = GoodRecords(1, 2) + "Far\nG2V 4 1e308 0 0\n"
+        + "Bright\nO5 -250 1 1 1\n" + "Edge\nG2V 100 1e6 -1e6 1e6\n";
+    Universe u(5000);
+    const CatalogueReport report = ReadText(text, &u);
+    EXPECT_EQ(report.outOfRange, 2);
+    EXPECT_EQ(report.outOfRangeLine, 6);
+    EXPECT_EQ(report.nonFinite, 0);
+    ASSERT_EQ(u.CountItems(), 5);
+    EXPECT_EQ(u.SystemAt(2)->position.x, 1e308);
+    EXPECT_EQ(u.SystemAt(3)->StarAt(0)->magnitude, -250);
+}
+
+TEST_F(UniverseTest, TheReportIsTheSameThroughAnyWindow)
+{
+    std::string text = GoodRecords(1, 400) + "Nan\nG2V nan 1 2 3\n" + std::string(1200, 'L') + "\n"
+        + GoodRecords(500, 300) + "Far\nG2 1 2e7 0 0\n";
+    Universe whole(5000);
+    const CatalogueReport expected = ReadText(text, &whole, text.size() + 1);
+    EXPECT_GT(expected.malformed, 300);
+    EXPECT_EQ(expected.nonFinite, 1);
+    // The shifted pairing reads "Star 500" to "Star 799" as class "Star" and magnitudes 500 to
+    // 799; the last two records, read from "Far" and an empty line, keep magnitude 799.
+    EXPECT_EQ(expected.outOfRange, 300 + 2);
+    for (size_t window : { size_t(1), size_t(97), size_t(1003), size_t(4096) }) {
+        Universe u(5000);
+        EXPECT_EQ(ReadText(text, &u, window), expected) << window;
+        EXPECT_EQ(u.CountItems(), whole.CountItems()) << window;
+    }
+}
+
+TEST_F(UniverseTest, ProgressCountsTheBytesReadUpToTheWholeFile)
+{
+    const std::string text = GoodRecords(1, 5000);
+    std::string copy = text;
+    std::unique_ptr<std::FILE, int (*)(std::FILE*)> in(
+        fmemopen(copy.data(), copy.size(), "rb"), &std::fclose);
+    std::vector<uint64_t> told;
+    Universe u(5000);
+    ReadCatalogue(
+        in.get(), 1000000, &u, 8192, nullptr, [&told](uint64_t bytes) { told.push_back(bytes); });
+    ASSERT_GT(told.size(), text.size() / 8192);
+    EXPECT_TRUE(std::is_sorted(told.begin(), told.end()));
+    EXPECT_EQ(told.back(), text.size());
+    EXPECT_EQ(u.CountItems(), 5000);
 }

@@ -1,12 +1,14 @@
 // Fuzzing the program's catalogue reader. The first byte of an input picks the size of the
 // reading window, so that records fall across its edges; the rest is the catalogue. Whatever the
-// window, the universe read is the one a window holding the whole input reads, and every name is
-// one line of at most 79 characters.
+// window, the universe read and what the reading reports are those a window holding the whole
+// input gives; every name is one line of at most 79 characters, every number finite, and an
+// input with a NUL byte reads as no catalogue at all.
 #include "ImportRoundTrip.h"
 
 #include "catalog/Star.h"
 #include "catalog/Universe.h"
 
+#include <cmath>
 #include <cstdio>
 #include <cstring>
 #include <memory>
@@ -16,11 +18,13 @@ namespace {
 
 using File = std::unique_ptr<std::FILE, int (*)(std::FILE*)>;
 
-void Read(std::string& text, size_t window, Universe* universe)
+CatalogueReport Read(std::string& text, size_t window, Universe* universe)
 {
     File file(fmemopen(text.data(), text.size(), "rb"), &std::fclose);
     FuzzCheck(file != nullptr, "cannot open the input as a file");
-    ReadCatalogue(file.get(), 1000000, universe, window);
+    CatalogueReport report;
+    ReadCatalogue(file.get(), 1000000, universe, window, &report);
+    return report;
 }
 
 // Doubles compared as the bits they are, so that NaN read twice counts as the same.
@@ -39,9 +43,14 @@ extern "C" int LLVMFuzzerTestOneInput(const uint8_t* data, size_t size)
     std::string text(reinterpret_cast<const char*>(data) + 1, size - 1);
 
     Universe small(5000), whole(5000);
-    Read(text, window, &small);
+    const CatalogueReport smallReport = Read(text, window, &small);
     // A window that holds the whole input reads it as the program's megabyte window does.
-    Read(text, text.size() + 1, &whole);
+    const CatalogueReport wholeReport = Read(text, text.size() + 1, &whole);
+    FuzzCheck(smallReport == wholeReport, "the window changes what the reading reports");
+    FuzzCheck(!wholeReport.notText || (whole.IsEmpty() && wholeReport.malformed == 0),
+        "a text with NUL bytes leaves systems or problems behind");
+    FuzzCheck(wholeReport.notText == (std::memchr(text.data(), '\0', text.size()) != nullptr),
+        "NUL bytes are missed or imagined");
     FuzzCheck(small.CountItems() == whole.CountItems(), "the window changes the systems read");
     for (int32_t s = 0; s < whole.CountItems(); s++) {
         const StarSystem* a = small.SystemAt(s);
@@ -50,6 +59,9 @@ extern "C" int LLVMFuzzerTestOneInput(const uint8_t* data, size_t size)
         FuzzCheck(Same(a->position.x, b->position.x) && Same(a->position.y, b->position.y)
                 && Same(a->position.z, b->position.z),
             "the window changes a position");
+        FuzzCheck(std::isfinite(b->position.x) && std::isfinite(b->position.y)
+                && std::isfinite(b->position.z),
+            "a position is not finite");
         FuzzCheck(a->CountItems() == b->CountItems(), "the window changes a system's stars");
         for (int32_t k = 0; k < b->CountItems(); k++) {
             const Star* p = a->StarAt(k);
@@ -58,6 +70,7 @@ extern "C" int LLVMFuzzerTestOneInput(const uint8_t* data, size_t size)
             FuzzCheck(std::strcmp(p->GetSpectralClassString(), q->GetSpectralClassString()) == 0,
                 "the window changes a spectral class");
             FuzzCheck(Same(p->GetMagnitude(), q->GetMagnitude()), "the window changes a magnitude");
+            FuzzCheck(std::isfinite(q->GetMagnitude()), "a magnitude is not finite");
             const size_t length = std::strlen(q->GetName());
             FuzzCheck(length <= 79, "a name is longer than 79 characters");
             FuzzCheck(
