@@ -3,6 +3,9 @@
 
 #include "platform/ExecutablePath.h"
 
+#include <QApplication>
+#include <QFontMetrics>
+#include <QProgressDialog>
 #include <QStandardPaths>
 #include <algorithm>
 #include <cerrno>
@@ -24,9 +27,73 @@ std::string Quoted(const std::filesystem::path& path)
     return quoted;
 }
 
+// The help line's text: before, the file's name, then after, the name shortened in its middle
+// as far as the line's width asks for. Should even that not be enough, the whole is cut at its
+// end.
+std::string HelpLine(
+    const std::string& before, const std::filesystem::path& file, const std::string& after)
+{
+    const QFontMetrics metrics(QApplication::font("QLabel"));
+    const QString head = QString::fromStdString(before);
+    const QString tail = QString::fromStdString(after);
+    const int room = kHelpLineWidth - metrics.horizontalAdvance(head + tail);
+    const QString name = metrics.elidedText(
+        QString::fromStdString(file.filename().string()), Qt::ElideMiddle, std::max(room, 0));
+    return metrics.elidedText(head + name + tail, Qt::ElideRight, kHelpLineWidth).toStdString();
+}
+
+// "1 record" or "n records".
+std::string Records(int64_t n)
+{
+    return std::to_string(n) + (n == 1 ? " record" : " records");
+}
+
+// The reading of a big catalogue shown as it goes: a progress window from the first window of
+// the file read to the end of reading.
+class ReadingProgress {
+public:
+    ReadingProgress(const std::filesystem::path& path, uint64_t size)
+        : fSize(size)
+    {
+        if (size < kProgressCatalogueBytes
+            || !qobject_cast<QApplication*>(QCoreApplication::instance()))
+            return;
+        fDialog = std::make_unique<QProgressDialog>();
+        fDialog->setWindowTitle("3D Nightdome");
+        fDialog->setLabelText(QString("Reading the star catalogue %1")
+                                  .arg(QString::fromStdString(path.filename().string())));
+        fDialog->setCancelButton(nullptr);
+        fDialog->setRange(0, kSteps);
+        fDialog->setWindowModality(Qt::ApplicationModal);
+        fDialog->setMinimumDuration(0);
+        fDialog->setValue(0);
+        fDialog->show();
+        QCoreApplication::processEvents();
+    }
+
+    // Told the bytes read so far.
+    void operator()(uint64_t bytes)
+    {
+        if (!fDialog)
+            return;
+        const int step
+            = int(std::min<uint64_t>(bytes, fSize) * kSteps / std::max<uint64_t>(fSize, 1));
+        if (step == fDialog->value())
+            return;
+        fDialog->setValue(step);
+        // The window is modal, so that nothing but it answers while the catalogue is read.
+        QCoreApplication::processEvents();
+    }
+
+private:
+    static constexpr int kSteps = 1000;
+    uint64_t fSize;
+    std::unique_ptr<QProgressDialog> fDialog;
+};
+
 // The catalogue read into a new universe; false, with the reason, when it cannot be read.
 bool ReadCatalogueFile(const std::filesystem::path& path, int32_t maxStars, Universe* universe,
-    bool* cut, std::string* reason)
+    bool* cut, CatalogueReport* report, std::string* reason)
 {
     std::error_code error;
     if (std::filesystem::is_directory(path, error)) {
@@ -39,12 +106,54 @@ bool ReadCatalogueFile(const std::filesystem::path& path, int32_t maxStars, Univ
         *reason = std::strerror(errno);
         return false;
     }
-    *cut = ReadCatalogue(file.get(), maxStars, universe);
+    const uintmax_t size = std::filesystem::file_size(path, error);
+    ReadingProgress progress(path, error ? 0 : uint64_t(size));
+    *cut = ReadCatalogue(file.get(), maxStars, universe, kCatalogueWindow, report,
+        [&progress](uint64_t bytes) { progress(bytes); });
     if (std::ferror(file.get())) {
         *reason = std::string("reading failed: ") + std::strerror(errno);
         return false;
     }
     return true;
+}
+
+// What the reading met, one line of standard error for each kind of flaw, and the first of
+// them for the help line.
+void TellFlaws(
+    const std::filesystem::path& path, const CatalogueReport& report, StartedUniverse* started)
+{
+    const auto at = [&path](int64_t line) {
+        return "nightdome: " + Quoted(path) + ", line " + std::to_string(line) + ": ";
+    };
+    const auto help = [&path, &started](int64_t line, const std::string& what) {
+        if (started->helpLine.empty())
+            started->helpLine = HelpLine("", path, ", line " + std::to_string(line) + ": " + what);
+    };
+    if (report.malformed > 0) {
+        static const char* const kCauses[][2] = {
+            { "a name longer than 500 characters", "name too long" },
+            { "a line longer than 500 characters", "line too long" },
+            { "a data line without its five fields", "fields missing" },
+        };
+        const char* const* cause = kCauses[report.cause];
+        started->report += at(report.malformedLine) + cause[0] + "; " + Records(report.malformed)
+            + " malformed\n";
+        help(report.malformedLine,
+            std::string(cause[1]) + "; " + std::to_string(report.malformed) + " bad "
+                + (report.malformed == 1 ? "record" : "records"));
+    }
+    if (report.nonFinite > 0) {
+        started->report += at(report.nonFiniteLine)
+            + "a number that is not finite (nan, inf or too large), read as 0; "
+            + Records(report.nonFinite) + " with such numbers\n";
+        help(report.nonFiniteLine, "not finite, read as 0; " + Records(report.nonFinite));
+    }
+    if (report.outOfRange > 0) {
+        started->report += at(report.outOfRangeLine)
+            + "a position beyond a million parsecs or a magnitude beyond 100, kept as read; "
+            + Records(report.outOfRange) + " so far out\n";
+        help(report.outOfRangeLine, "far out of range; " + Records(report.outOfRange));
+    }
 }
 
 } // namespace
@@ -102,26 +211,37 @@ StartedUniverse StartUniverse(const StartOptions& options, int32_t maxStars)
 
     bool cut = false;
     std::string reason;
-    if (!ReadCatalogueFile(path, maxStars, started.universe, &cut, &reason)) {
+    CatalogueReport flaws;
+    if (!ReadCatalogueFile(path, maxStars, started.universe, &cut, &flaws, &reason)) {
         delete started.universe;
         started.universe = new Universe(kUniverseBlockSize);
         started.report = "nightdome: cannot read the star catalogue " + Quoted(path) + ": " + reason
             + "; starting with an empty sky\n";
-        started.helpLine = "Cannot read " + path.filename().string() + ": " + reason;
+        started.helpLine = HelpLine("Cannot read ", path, ": " + reason);
+        return started;
+    }
+    if (flaws.notText) {
+        started.report = "nightdome: " + Quoted(path)
+            + " holds NUL bytes, which no text does: it is not a star catalogue; starting with an "
+              "empty sky\n";
+        started.helpLine = HelpLine("", path, " is not a star catalogue: the sky is empty");
         return started;
     }
     started.catalogue = path;
     if (started.universe->IsEmpty()) {
         started.report = "nightdome: the star catalogue " + Quoted(path)
             + " holds no stars; starting with an empty sky\n";
-        started.helpLine = path.filename().string() + " holds no stars: the sky is empty";
-    } else if (cut) {
+        started.helpLine = HelpLine("", path, " holds no stars: the sky is empty");
+        return started;
+    }
+    TellFlaws(path, flaws, &started);
+    if (cut) {
         const std::string limit = std::to_string(maxStars);
-        started.report = "nightdome: the star catalogue " + Quoted(path) + " holds more than "
+        started.report += "nightdome: the star catalogue " + Quoted(path) + " holds more than "
             + limit + " stars, the most the program holds; only the first " + limit
             + " were read\n";
-        started.helpLine
-            = "Only the first " + limit + " stars of " + path.filename().string() + " were read";
+        if (started.helpLine.empty())
+            started.helpLine = HelpLine("Read only the first " + limit + " stars of ", path, "");
     }
     return started;
 }

@@ -14,6 +14,13 @@
 inline constexpr int32_t kUniverseMaxStars = 1000000;
 // The list of systems grows by this many at a time.
 inline constexpr int32_t kUniverseBlockSize = 5000;
+// The control window's help line is this many pixels wide: what start-up says there is fitted
+// to it, a long file name shortened in its middle.
+inline constexpr int kHelpLineWidth = 316;
+// A catalogue of this many bytes or more (about 300,000 stars) takes longer than half a second
+// or so to read: while it is read, a window shows how far the reading has come. Decided by
+// size, not by a clock, so that the same file always shows it or never.
+inline constexpr uint64_t kProgressCatalogueBytes = uint64_t(16) << 20;
 
 struct StartedUniverse {
     Universe* universe = nullptr; // never null; the caller owns it
@@ -28,7 +35,10 @@ struct StartedUniverse {
 // nightdome folder of each of $XDG_DATA_DIRS.
 std::vector<std::filesystem::path> CatalogueCandidates();
 
-// Builds the universe options ask for. A catalogue that cannot be read, or holds no stars,
-// gives an empty sky; one with more than maxStars stars is read up to that many. Either is
-// reported on one line of report and on the help line.
+// Builds the universe options ask for. A catalogue that cannot be read, holds no stars, or
+// holds NUL bytes (no text does) gives an empty sky; one with more than maxStars stars is read
+// up to that many. Either is reported on one line of report and on the help line, as is each
+// kind of flaw the reading met in a catalogue (lines too long, missing fields, numbers not
+// finite or far out of range), with the line of the first and how many records it touched.
+// A catalogue of kProgressCatalogueBytes or more is read under a progress window.
 StartedUniverse StartUniverse(const StartOptions& options, int32_t maxStars = kUniverseMaxStars);

@@ -2,6 +2,7 @@
 // command line, a generated sky, and one clear line for each thing that goes wrong.
 #include "app/StartUniverse.h"
 #include "app/ThreeDNightdomeApp.h"
+#include "catalog/Star.h"
 #include "chart/UniverseView.h"
 #include "chart/UniverseWindow.h"
 #include "platform/ExecutablePath.h"
@@ -9,7 +10,10 @@
 
 #include <QDir>
 #include <QFile>
+#include <QFontMetrics>
 #include <QProcess>
+#include <QProgressBar>
+#include <QProgressDialog>
 #include <QTemporaryDir>
 #include <QTest>
 #include <gtest/gtest.h>
@@ -46,6 +50,49 @@ int64_t CountStars(const Universe& universe)
         stars += universe.SystemAt(i)->CountItems();
     return stars;
 }
+
+// Whether text fits the control window's help line, in the font the line shows it in.
+bool FitsTheHelpLine(const std::string& text)
+{
+    const QFontMetrics metrics(QApplication::font("QLabel"));
+    return metrics.horizontalAdvance(QString::fromStdString(text)) <= kHelpLineWidth;
+}
+
+// The catalogue at path started with, its universe owned by the caller.
+StartedUniverse StartWith(const fs::path& path)
+{
+    StartOptions options;
+    options.catalogue = path.string();
+    return StartUniverse(options);
+}
+
+// Watches, while it lives, for progress windows: the label of each one shown, and the values
+// their bars are painted with.
+class ProgressWatch : public QObject {
+public:
+    ProgressWatch() { QCoreApplication::instance()->installEventFilter(this); }
+    ~ProgressWatch() override { QCoreApplication::instance()->removeEventFilter(this); }
+
+    std::vector<QString> shown;
+    std::vector<int> painted;
+    int maximum = 0;
+
+protected:
+    bool eventFilter(QObject* watched, QEvent* event) override
+    {
+        if (event->type() == QEvent::Show) {
+            if (auto* dialog = qobject_cast<QProgressDialog*>(watched)) {
+                shown.push_back(dialog->labelText());
+                maximum = dialog->maximum();
+            }
+        } else if (event->type() == QEvent::Paint) {
+            auto* bar = qobject_cast<QProgressBar*>(watched);
+            if (bar && qobject_cast<QProgressDialog*>(bar->parentWidget()))
+                painted.push_back(bar->value());
+        }
+        return false;
+    }
+};
 
 // The user's data folders pointed at folders of the test's own while it runs.
 class DataFolders : public ::testing::Test {
@@ -239,7 +286,7 @@ TEST(StartUniverse, ACatalogueBeyondTheLimitIsReadUpToItAndSaysSo)
         "nightdome: the star catalogue '" + path.string()
             + "' holds more than 3 stars, the most the program holds; only the first 3 were "
               "read\n");
-    EXPECT_EQ(started.helpLine, "Only the first 3 stars of big.dat were read");
+    EXPECT_EQ(started.helpLine, "Read only the first 3 stars of big.dat");
 
     // Exactly at the limit nothing is left over, and nothing is said.
     started = StartUniverse(options, 5);
@@ -247,6 +294,151 @@ TEST(StartUniverse, ACatalogueBeyondTheLimitIsReadUpToItAndSaysSo)
     EXPECT_EQ(CountStars(*universe), 5);
     EXPECT_TRUE(started.report.empty());
     EXPECT_TRUE(started.helpLine.empty());
+}
+
+TEST(StartUniverse, AFileHoldingNulBytesIsNoCatalogue)
+{
+    // A program, as given with --catalogue /bin/ls: this test program itself.
+    const fs::path program = QCoreApplication::applicationFilePath().toStdString();
+    StartedUniverse started = StartWith(program);
+    std::unique_ptr<Universe> universe(started.universe);
+    EXPECT_TRUE(universe->IsEmpty());
+    EXPECT_TRUE(started.catalogue.empty());
+    EXPECT_EQ(started.report,
+        "nightdome: '" + program.string()
+            + "' holds NUL bytes, which no text does: it is not a star catalogue; starting with "
+              "an empty sky\n");
+    EXPECT_EQ(started.helpLine,
+        program.filename().string() + " is not a star catalogue: the sky is empty");
+
+    // Two gigabytes of zero bytes (a sparse file): refused at once, not read as phantom stars.
+    QTemporaryDir dir;
+    const fs::path zeros = fs::path(dir.filePath("zeros.dat").toStdString());
+    Write(zeros, "");
+    fs::resize_file(zeros, uintmax_t(2) << 30);
+    started = StartWith(zeros);
+    universe.reset(started.universe);
+    EXPECT_TRUE(universe->IsEmpty());
+    EXPECT_EQ(started.helpLine, "zeros.dat is not a star catalogue: the sky is empty");
+    EXPECT_NE(started.report.find("it is not a star catalogue"), std::string::npos);
+}
+
+TEST(StartUniverse, ANameLongerThanALineIsToldWithItsLineAndTheRecordsItSpoils)
+{
+    QTemporaryDir dir;
+    const fs::path path = fs::path(dir.filePath("stars.dat").toStdString());
+    // Eight good records (lines 1 to 16), a name of 5,000 characters on line 17, 3 records more.
+    Write(path, Stars(8) + std::string(5000, 'N') + "\nG2V 4.8 9 0 0\n" + Stars(3));
+    const StartedUniverse started = StartWith(path);
+    std::unique_ptr<Universe> universe(started.universe);
+    // Read as ever; the file is still the catalogue.
+    EXPECT_EQ(started.catalogue, path);
+    EXPECT_EQ(universe->SystemAt(7)->GetName(), std::string("Star 7"));
+    // The long line gives five records, the shifted pairing spoils the four after it.
+    EXPECT_EQ(started.report,
+        "nightdome: '" + path.string()
+            + "', line 17: a name longer than 500 characters; 9 records malformed\n");
+    EXPECT_EQ(started.helpLine, "stars.dat, line 17: name too long; 9 bad records");
+    EXPECT_TRUE(FitsTheHelpLine(started.helpLine));
+}
+
+TEST(StartUniverse, NumbersNotFiniteAndFarOutOfRangeAreTold)
+{
+    QTemporaryDir dir;
+    const fs::path path = fs::path(dir.filePath("odd.dat").toStdString());
+    Write(path,
+        Stars(2) + "Nan\nG2V nan 1 2 3\nInf\nK0 1 inf 5 6\nHuge\nM0 2 7 1e400 0\n"
+            + "Far\nG2V 4 1e308 0 0\n" + Stars(1));
+    const StartedUniverse started = StartWith(path);
+    std::unique_ptr<Universe> universe(started.universe);
+    EXPECT_EQ(universe->CountItems(), 7);
+    EXPECT_EQ(universe->SystemAt(2)->StarAt(0)->magnitude, 0);
+    EXPECT_EQ(started.report,
+        "nightdome: '" + path.string()
+            + "', line 6: a number that is not finite (nan, inf or too large), read as 0; 3 "
+              "records with such numbers\n"
+              "nightdome: '"
+            + path.string()
+            + "', line 12: a position beyond a million parsecs or a magnitude beyond 100, kept "
+              "as read; 1 record so far out\n");
+    EXPECT_EQ(started.helpLine, "odd.dat, line 6: not finite, read as 0; 3 records");
+    EXPECT_TRUE(FitsTheHelpLine(started.helpLine));
+
+    const fs::path far = fs::path(dir.filePath("far.dat").toStdString());
+    Write(far, Stars(1) + "Far\nG2V 4 1e308 0 0\n");
+    const StartedUniverse farStarted = StartWith(far);
+    std::unique_ptr<Universe> farUniverse(farStarted.universe);
+    EXPECT_EQ(farUniverse->SystemAt(1)->position.x, 1e308);
+    EXPECT_EQ(farStarted.helpLine, "far.dat, line 4: far out of range; 1 record");
+}
+
+TEST(StartUniverse, EveryHelpLineFitsWithLongFileNamesShortenedInTheirMiddle)
+{
+    QTemporaryDir dir;
+    const std::string longName
+        = "the southern sky survey of every star within two hundred parsecs, second edition.dat";
+    const fs::path path = fs::path(dir.filePath(QString::fromStdString(longName)).toStdString());
+    StartOptions options;
+    options.catalogue = path.string();
+    const auto check = [&](const std::string& text, int32_t maxStars, const std::string& start,
+                           const std::string& end) {
+        Write(path, text);
+        const StartedUniverse started = StartUniverse(options, maxStars);
+        std::unique_ptr<Universe> universe(started.universe);
+        EXPECT_TRUE(FitsTheHelpLine(started.helpLine)) << started.helpLine;
+        EXPECT_EQ(started.helpLine.rfind(start, 0), 0u) << started.helpLine;
+        ASSERT_GE(started.helpLine.size(), end.size());
+        EXPECT_EQ(started.helpLine.substr(started.helpLine.size() - end.size()), end)
+            << started.helpLine;
+        // The name is shortened in its middle, its both ends kept.
+        EXPECT_NE(started.helpLine.find("\u2026"), std::string::npos) << started.helpLine;
+        EXPECT_NE(started.report.find(longName), std::string::npos) << started.report;
+    };
+    check(Stars(5), 3, "Read only the first 3 stars of the", "dition.dat");
+    check(Stars(5) + "\x7f" + std::string(1, '\0'), 1000000, "the",
+        " is not a star catalogue: the sky is empty");
+    check("", 1000000, "the", " holds no stars: the sky is empty");
+    check(Stars(2) + std::string(1300, 'x') + "\n" + Stars(2), 1000000, "the",
+        ", line 5: name too long; 4 bad records");
+    const StartedUniverse folder = StartWith(fs::path(dir.path().toStdString()));
+    std::unique_ptr<Universe> none(folder.universe);
+    EXPECT_TRUE(FitsTheHelpLine(folder.helpLine)) << folder.helpLine;
+}
+
+TEST(StartUniverse, ABigCatalogueIsReadUnderAProgressWindow)
+{
+    QTemporaryDir dir;
+    const fs::path path = fs::path(dir.filePath("big stars.dat").toStdString());
+    {
+        // Records of about 100 bytes, past the size that takes half a second to read.
+        std::ofstream out(path, std::ios::binary);
+        const std::string name(79, 'n');
+        for (int i = 0; uint64_t(out.tellp()) < kProgressCatalogueBytes + 1000; i++)
+            out << name << '\n' << "K5V 7.25 " << i << ".125 -" << i << ".5 0.0625\n";
+    }
+    ProgressWatch watch;
+    StartedUniverse started = StartWith(path);
+    std::unique_ptr<Universe> universe(started.universe);
+    EXPECT_GT(universe->CountItems(), 140000);
+    EXPECT_TRUE(started.helpLine.empty()) << started.helpLine;
+    ASSERT_EQ(watch.shown.size(), 1u);
+    EXPECT_EQ(watch.shown[0].toStdString(), "Reading the star catalogue big stars.dat");
+    // Painted as the reading went, sixteen windows of a megabyte, up to the end.
+    ASSERT_GE(watch.painted.size(), 8u);
+    EXPECT_TRUE(std::is_sorted(watch.painted.begin(), watch.painted.end()));
+    EXPECT_EQ(watch.painted.back(), watch.maximum);
+    // Gone once the universe is there.
+    for (QWidget* widget : QApplication::topLevelWidgets())
+        EXPECT_FALSE(qobject_cast<QProgressDialog*>(widget) && widget->isVisible());
+
+    // A small catalogue shows none.
+    ProgressWatch quiet;
+    const fs::path small = fs::path(dir.filePath("small.dat").toStdString());
+    Write(small, Stars(1000));
+    started = StartWith(small);
+    universe.reset(started.universe);
+    EXPECT_EQ(universe->CountItems(), 1000);
+    EXPECT_TRUE(quiet.shown.empty());
 }
 
 TEST(StartUniverse, GenerateMakesThatManySystems)
@@ -279,12 +471,19 @@ TEST(ThreeDNightdomeAppStart, AMillionAndOneStarsAreReadToTheLimitAndSaidOnTheHe
     char name[] = "nightdome";
     char* argv[] = { name, nullptr };
     testing::internal::CaptureStderr();
+    ProgressWatch watch;
     auto* application = new ThreeDNightdomeApp(argc, argv, options);
+    // Read under a progress window, which is gone once the program's windows are up.
+    ASSERT_EQ(watch.shown.size(), 1u);
+    EXPECT_EQ(watch.shown[0].toStdString(), "Reading the star catalogue huge.dat");
+    EXPECT_FALSE(watch.painted.empty());
     const std::string error = testing::internal::GetCapturedStderr();
     ControlWindow* controls = application->GetControlWindow();
     EXPECT_EQ(CountStars(*controls->GetUniverse()), kUniverseMaxStars);
-    EXPECT_EQ(
-        controls->GetInfoView()->text(), "Only the first 1000000 stars of huge.dat were read");
+    const InfoView* line = controls->GetInfoView();
+    EXPECT_EQ(line->text(), "Read only the first 1000000 stars of huge.dat");
+    EXPECT_LE(QFontMetrics(line->font()).horizontalAdvance(line->text()), line->width());
+    EXPECT_EQ(line->width(), kHelpLineWidth);
     EXPECT_NE(error.find("holds more than 1000000 stars"), std::string::npos) << error;
     ASSERT_EQ(controls->UniverseWindows().size(), 1);
     EXPECT_EQ(controls->UniverseWindows().first()->View()->threadCount, 3);
