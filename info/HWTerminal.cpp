@@ -187,6 +187,9 @@ void HWTerminal::HWTSetTermColor(rgb_color lines, rgb_color back)
 
 void HWTerminal::HWTPurgeBuffer()
 {
+    // Between commands only: the thread holds the render lock from a command's first byte to
+    // its last parameter. In the lock order, render before command.
+    std::lock_guard render(fRenderLock);
     std::lock_guard lock(fCommandLock);
     readPos = 0;
     writePos = 0;

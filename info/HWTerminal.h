@@ -14,11 +14,12 @@
 //   buffer used up, and clears or sets `done` under it too, so that no append is ever missed.
 // - fRenderLock (recursive) guards what the terminal thread owns while it runs: the grid, the
 //   intensities, the cursor, the colours, colorTable, the palette indices, the font metrics and the
-//   bitmap's pixels. The thread holds it while it executes a command, fades and renders (never
-//   while it sleeps); the setters take it, so SetCharacterColors and friends may be called from the
-//   GUI thread while the thread runs. It is recursive because a subclass's RenderBackground runs
-//   under it and may call the setters and accessors itself. Order: fRenderLock before
-//   fCommandLock, never the other way.
+//   bitmap's pixels. The thread holds it while it takes and executes a command (from its first
+//   byte to its last parameter, so that a purge, which takes it as well, falls between
+//   commands), fades and renders (never while it sleeps); the setters take it, so
+//   SetCharacterColors and friends may be called from the GUI thread while the thread runs. It is
+//   recursive because a subclass's RenderBackground runs under it and may call the setters and
+//   accessors itself. Order: fRenderLock before fCommandLock, never the other way.
 // - fHandOver guards the front buffer: the thread copies a finished frame into it (giving up on
 //   that frame after 0.1 s), the GUI thread converts it to colour in paintEvent.
 // - The delays, followLength, `done` and `running` are relaxed atomics read without a lock.
@@ -103,7 +104,8 @@ public:
     void HWTCPS(uint8_t cps);
     void HWTSetCharColor(rgb_color newColor, rgb_color oldColor);
     void HWTSetTermColor(rgb_color lines, rgb_color back);
-    // Drops everything not yet executed; what is shown stays.
+    // Drops everything not yet executed; what is shown stays. Waits for a command the thread is
+    // in the middle of (and a frame it is rendering) to finish.
     void HWTPurgeBuffer();
     // Whether the thread found the buffer empty since the last append.
     bool HWTIsDone() const { return done.load(std::memory_order_relaxed); }

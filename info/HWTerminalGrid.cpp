@@ -27,29 +27,37 @@ int32_t HWTerminal::PrintToTerminal(int32_t count)
     int32_t executed = 0;
     if (count <= 0)
         return executed;
-    uint8_t byte;
     // Running out of bytes rewinds the buffer (TGetParam); so does a missing parameter byte,
     // which loses the partial command and ends the batch.
-    while (!TGetParam(byte)) {
-        if (byte == kCmdPause) {
-            uint8_t seconds;
-            if (TGetParam(seconds))
+    for (;;) {
+        bigtime_t pause = -1;
+        {
+            // A command is taken whole, its first byte and its parameters, under the render
+            // lock: a purge, which takes it too, cannot fall between them and leave the rest of
+            // the command to be read from whatever is appended after the purge.
+            std::lock_guard lock(fRenderLock);
+            uint8_t byte;
+            if (TGetParam(byte))
                 return executed;
-            // Slept without the render lock, so that the settings stay free meanwhile.
-            const bigtime_t pause = bigtime_t(seconds) * 1000000;
+            if (byte == kCmdPause) {
+                uint8_t seconds;
+                if (TGetParam(seconds))
+                    return executed;
+                pause = bigtime_t(seconds) * 1000000;
+            } else if (!Execute(byte)) {
+                return executed;
+            }
+        }
+        // Slept without the render lock, so that the settings stay free meanwhile.
+        if (pause >= 0) {
             if (fPauseHook)
                 fPauseHook(pause);
             else
                 Nap(pause);
-        } else {
-            std::lock_guard lock(fRenderLock);
-            if (!Execute(byte))
-                return executed;
         }
         if (++executed == count)
             return executed;
     }
-    return executed;
 }
 
 bool HWTerminal::Execute(uint8_t byte)

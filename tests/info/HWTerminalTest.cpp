@@ -16,6 +16,7 @@
 #include <cstring>
 #include <gtest/gtest.h>
 #include <memory>
+#include <mutex>
 #include <string>
 #include <thread>
 #include <vector>
@@ -62,6 +63,12 @@ protected:
         for (int32_t col = from; col < (to < 0 ? terminal->Cols() : to); col++)
             text += terminal->CharAt(row, col) ? char(terminal->CharAt(row, col)) : '.';
         return text;
+    }
+
+    // A whole row as Row reads it: text from column 0, the rest empty.
+    std::string RowWith(const std::string& text) const
+    {
+        return text + std::string(size_t(terminal->Cols()) - text.size(), '.');
     }
 
     uint8_t Pixel(int32_t x, int32_t y) const
@@ -677,8 +684,12 @@ TEST_F(HWTerminalThreadTest, IdleThreadIsSuspendedDoneAndWokenByEveryAppend)
     EXPECT_EQ(Row(0, 0, 4), "abc.");
     EXPECT_EQ(terminal->IntensityAt(0, 2), 0);
 
-    terminal->HWTPrintChar('d');
-    EXPECT_FALSE(terminal->HWTIsDone());
+    {
+        // Held, the render lock keeps the thread from typing the append before it is looked at.
+        std::lock_guard hold(terminal->RenderLock());
+        terminal->HWTPrintChar('d');
+        EXPECT_FALSE(terminal->HWTIsDone());
+    }
     ASSERT_TRUE(WaitFor([&] { return terminal->CharAt(0, 3) == 'd'; }));
     ASSERT_TRUE(WaitFor([&] { return terminal->IsSuspended() && terminal->HWTIsDone(); }));
     EXPECT_EQ(terminal->IntensityAt(0, 3), 0);
@@ -687,6 +698,57 @@ TEST_F(HWTerminalThreadTest, IdleThreadIsSuspendedDoneAndWokenByEveryAppend)
     for (char c = 'e'; c <= 'z'; c++)
         terminal->HWTPrintChar(c);
     ASSERT_TRUE(WaitFor([&] { return Row(0, 0, 27) == "abcdefghijklmnopqrstuvwxyz."; }));
+    terminal->DetachedFromWindow();
+}
+
+TEST_F(HWTerminalThreadTest, APurgeFallsBetweenCommandsNeverInsideOne)
+{
+    terminal->AttachedToWindow();
+    ASSERT_TRUE(WaitFor([&] { return terminal->IsSuspended(); }));
+    for (int round = 0; round < 3; round++) {
+        {
+            // The thread is kept from rendering and executing while a move is appended: it may
+            // at most take the move's first byte before it waits for the lock.
+            std::unique_lock hold(terminal->RenderLock());
+            terminal->HWTMoveTo(5, 30);
+            // A thread that takes commands outside the lock takes the first byte now; one that
+            // takes them under it cannot, and this wait ends at its time-out.
+            (void)QTest::qWaitFor([&] { return terminal->PendingBytes() < 3; }, 200);
+            // The move is dropped whole, and a new screen is written.
+            terminal->HWTPurgeBuffer();
+            terminal->HWTClearTerminal();
+            terminal->HWTMoveTo(1, 2);
+            terminal->HWTPrintString("OK");
+        }
+        ASSERT_TRUE(WaitFor([&] { return terminal->IsSuspended() && terminal->HWTIsDone(); }));
+        for (int32_t row = 0; row < terminal->Rows(); row++)
+            EXPECT_EQ(Row(row), RowWith(row == 1 ? "..OK" : ""))
+                << "round " << round << ", row " << row;
+    }
+    terminal->DetachedFromWindow();
+}
+
+TEST_F(HWTerminalThreadTest, PurgesRacingTheThreadLeaveACleanScreen)
+{
+    // Purges at every moment of the thread's work, one after the other, each followed by the
+    // same screen: whatever was cut off, the screen ends as that screen.
+    terminal->SetCPS(100000);
+    terminal->SetFPS(1000);
+    terminal->AttachedToWindow();
+    for (int round = 0; round < 200; round++) {
+        for (uint8_t row = 0; row < 10; row++) {
+            terminal->HWTMoveTo(row, uint8_t(row * 3));
+            terminal->HWTClearRow(row, 0);
+            terminal->HWTPrintString("noise");
+        }
+        terminal->HWTPurgeBuffer();
+        terminal->HWTClearTerminal();
+        terminal->HWTMoveTo(2, 4);
+        terminal->HWTPrintString("clean");
+    }
+    ASSERT_TRUE(WaitFor([&] { return terminal->IsSuspended() && terminal->HWTIsDone(); }));
+    for (int32_t row = 0; row < terminal->Rows(); row++)
+        EXPECT_EQ(Row(row), RowWith(row == 2 ? "....clean" : "")) << "row " << row;
     terminal->DetachedFromWindow();
 }
 
