@@ -2,20 +2,23 @@
 // and the help line for the half under the mouse.
 #include "info/StarIView.h"
 
+#include "catalog/CNumbers.h"
 #include "catalog/Star.h"
 #include "catalog/StarSystem.h"
 #include "catalog/Universe.h"
 #include "core/CCoord.h"
 #include "core/Constants.h"
 #include "core/MessageCodes.h"
+#include "render/AsciiText.h"
 #include "render/RBitmap8.h"
 #include "widgets/WidgetGeometry.h"
 
 #include <QDragEnterEvent>
 #include <QDropEvent>
 #include <QMouseEvent>
+#include <algorithm>
 #include <cmath>
-#include <cstdio>
+#include <string>
 
 namespace {
 
@@ -29,13 +32,36 @@ constexpr uint8_t kNameCol = 4;
 constexpr uint8_t kDistanceCol = 12;
 constexpr uint8_t kClassCol = 28;
 constexpr uint8_t kLuminosityCol = 40;
-constexpr uint8_t kMembersShown = 3; // rows each block clears; more members type on below
+constexpr uint8_t kMembersShown = 3; // rows of a block; more members are counted, not listed
+constexpr int32_t kNameLength = 23; // characters of a name's field, from kNameCol
 
 // Types text at (row, col), at most maxLength characters of it.
 void PrintAt(HWTerminal& terminal, int32_t row, uint8_t col, const char* text, int32_t maxLength)
 {
     terminal.HWTMoveTo(uint8_t(row), col);
     terminal.HWTPrintString(text, maxLength);
+}
+
+// Types the name of member i of system at row of its block. The font has ASCII only, so the
+// name is spelled in ASCII. A system of more members than the block has rows lists the first
+// ones and ends the last row's name with how many more there are ("Wolf 630 B  +2"), the name
+// shortened so that the count fits in the field.
+void PrintName(HWTerminal& terminal, int32_t row, const StarSystem* system, int32_t i)
+{
+    std::string name = AsciiTransliteration(system->StarAt(i)->GetName());
+    const int32_t more = system->CountItems() - kMembersShown;
+    if (i == kMembersShown - 1 && more > 0) {
+        const std::string mark = "  +" + std::to_string(more);
+        name.resize(std::min(name.size(), size_t(kNameLength) - mark.size()));
+        name += mark;
+    }
+    PrintAt(terminal, row, kNameCol, name.c_str(), kNameLength);
+}
+
+// How many members of system have a row.
+int32_t MembersShown(const StarSystem* system)
+{
+    return std::min<int32_t>(system->CountItems(), kMembersShown);
 }
 
 } // namespace
@@ -121,14 +147,14 @@ void StarIView::PrintStar1Block()
     for (uint8_t i = 0; i < kMembersShown; i++)
         HWTClearRow(uint8_t(kStar1FirstRow + i), kNameCol);
     char text[128];
-    for (int32_t i = 0; i < system1->CountItems(); i++) {
+    for (int32_t i = 0; i < MembersShown(system1); i++) {
         const Star* star = system1->StarAt(i);
         const int32_t row = kStar1FirstRow + i;
-        PrintAt(*this, row, kNameCol, star->GetName(), 23);
-        std::snprintf(
+        PrintName(*this, row, system1, i);
+        FormatCLocale(
             text, sizeof text, "%.1f %s", star->GetMagnitude(), star->GetSpectralClassString());
         PrintAt(*this, row, kClassCol, text, 10);
-        std::snprintf(text, sizeof text, "%f", SolarLuminosity(star->GetMagnitude()));
+        FormatCLocale(text, sizeof text, "%f", SolarLuminosity(star->GetMagnitude()));
         PrintAt(*this, row, kLuminosityCol, text, 10);
     }
 }
@@ -144,29 +170,29 @@ void StarIView::PrintStar2Block()
 
     char text[128];
     HWTClearRow(kDistanceRow, kDistanceCol);
-    std::snprintf(
+    FormatCLocale(
         text, sizeof text, "%.2f parsecs ( %.2f light-years )", d, d * kLightYearsPerParsec);
     PrintAt(*this, kDistanceRow, kDistanceCol, text, 35);
 
     for (uint8_t i = 0; i < kMembersShown; i++)
         HWTClearRow(uint8_t(kStar2FirstRow + i), kNameCol);
-    for (int32_t i = 0; i < system2->CountItems(); i++) {
+    for (int32_t i = 0; i < MembersShown(system2); i++) {
         const Star* star = system2->StarAt(i);
         const int32_t row = kStar2FirstRow + i;
-        PrintAt(*this, row, kNameCol, star->GetName(), 23);
+        PrintName(*this, row, system2, i);
         // Apparent magnitude at distance d from the absolute one (the magnitude at 10 pc).
         const double apparent = (star->GetMagnitude() - 5) - 5 * std::log10(1 / d);
-        std::snprintf(text, sizeof text, "%.1f %s", apparent, star->GetSpectralClassString());
+        FormatCLocale(text, sizeof text, "%.1f %s", apparent, star->GetSpectralClassString());
         PrintAt(*this, row, kClassCol, text, 10);
     }
 
-    std::snprintf(text, sizeof text, "%.0fh", c.raHours);
+    FormatCLocale(text, sizeof text, "%.0fh", c.raHours);
     PrintAt(*this, kStar2FirstRow, 41, text, 3);
-    std::snprintf(text, sizeof text, "%.1fm", c.raMinutes);
+    FormatCLocale(text, sizeof text, "%.1fm", c.raMinutes);
     PrintAt(*this, kStar2FirstRow, 45, text, 5);
-    std::snprintf(text, sizeof text, "%+.0fd", c.decDegrees);
+    FormatCLocale(text, sizeof text, "%+.0fd", c.decDegrees);
     PrintAt(*this, kStar2FirstRow + 1, 40, text, 4);
-    std::snprintf(text, sizeof text, "%.1f'", c.decMinutes);
+    FormatCLocale(text, sizeof text, "%.1f'", c.decMinutes);
     PrintAt(*this, kStar2FirstRow + 1, 45, text, 5);
 }
 

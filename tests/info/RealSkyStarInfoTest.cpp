@@ -211,3 +211,106 @@ TEST_F(RealSkyStarInfo, APictureOfTheWindow)
     DeliverPostedMessages();
     EXPECT_TRUE(window.grab().save(QString(shots) + "/star-info.png"));
 }
+
+namespace {
+
+// The rows of the screen that no system's members write: the headers, untouched.
+void ExpectHeadersIntact(const StarIView& view)
+{
+    EXPECT_EQ(ScreenText(view, 0, 0, 52),
+        RowOf({ { 0, "STAR 1" }, { 28, "SPECTRAL" }, { 40, "VISUAL" } }));
+    EXPECT_EQ(ScreenText(view, 1, 0, 52),
+        RowOf({ { 0, "NAME" }, { 28, "CLASS" }, { 40, "LUMINOSITY" } }));
+    EXPECT_EQ(ScreenRow(view, 5), "");
+    EXPECT_EQ(ScreenText(view, 6, 0, 12), "  DISTANCE:");
+    EXPECT_EQ(ScreenRow(view, 7), "");
+    EXPECT_EQ(ScreenText(view, 8, 0, 52),
+        RowOf({ { 0, "STAR 2" }, { 28, "SPECTRAL" }, { 40, "R ASCENSION" } }));
+    EXPECT_EQ(ScreenText(view, 9, 0, 52),
+        RowOf({ { 0, "NAME" }, { 28, "CLASS" }, { 40, "DECLINATION" } }));
+}
+
+// A block's three rows from row first: each member's name after its letter, the third
+// followed by how many more there are; rows without a member hold just their letter.
+void ExpectMembers(const StarIView& view, int32_t first, const StarSystem* system)
+{
+    for (int32_t i = 0; i < 3; i++) {
+        const std::string label = std::string(" ") + char('A' + i) + ":";
+        if (i >= system->CountItems()) {
+            EXPECT_EQ(ScreenRow(view, first + i), label) << "row " << first + i;
+            continue;
+        }
+        std::string name = system->StarAt(i)->GetName();
+        if (i == 2 && system->CountItems() > 3) {
+            const std::string mark = "  +" + std::to_string(system->CountItems() - 3);
+            name = name.substr(0, 23 - mark.size()) + mark;
+        }
+        EXPECT_EQ(ScreenText(view, first + i, 0, 28), RowOf({ { 0, label }, { 4, name } }))
+            << "row " << first + i;
+    }
+}
+
+} // namespace
+
+TEST_F(RealSkyStarInfo, Wolf630ListsThreeMembersCountsTheRestAndLeavesTheScreenClean)
+{
+    const int32_t wolf = SystemWithMember(*sky, "Wolf 630 A");
+    const int32_t alula = SystemWithMember(*sky, "Alula Australis");
+    ASSERT_GE(wolf, 0);
+    ASSERT_GE(alula, 0);
+    ASSERT_GE(sky->SystemAt(wolf)->CountItems(), 4) << "Wolf 630 is no longer a system of many";
+    ASSERT_GE(sky->SystemAt(alula)->CountItems(), 4);
+    StarIView view(BPoint(0, 0), "Star Info View");
+    SendUniverse(view);
+    Drop(view, wolf, 20);
+    Drop(view, alula, 150);
+    TypeAll(view);
+    std::printf("Wolf 630 over Alula Australis:\n%s\n%s\n%s\n%s\n%s\n%s\n",
+        ScreenRow(view, 2).c_str(), ScreenRow(view, 3).c_str(), ScreenRow(view, 4).c_str(),
+        ScreenRow(view, 10).c_str(), ScreenRow(view, 11).c_str(), ScreenRow(view, 12).c_str());
+    ExpectHeadersIntact(view);
+    ExpectMembers(view, 2, sky->SystemAt(wolf));
+    ExpectMembers(view, 10, sky->SystemAt(alula));
+
+    // Sirius after them, on each half in turn: every row clean.
+    Drop(view, sirius, 20);
+    TypeAll(view);
+    ExpectHeadersIntact(view);
+    ExpectMembers(view, 2, sky->SystemAt(sirius));
+    ExpectMembers(view, 10, sky->SystemAt(alula));
+    Drop(view, wolf, 150);
+    TypeAll(view);
+    ExpectMembers(view, 10, sky->SystemAt(wolf));
+    Drop(view, alphaCentauri, 20);
+    Drop(view, sirius, 150);
+    TypeAll(view);
+    ExpectHeadersIntact(view);
+    ExpectMembers(view, 2, sky->SystemAt(alphaCentauri));
+    ExpectMembers(view, 10, sky->SystemAt(sirius));
+}
+
+TEST_F(RealSkyStarInfo, PicturesOfWolf630AndOfSiriusAfterIt)
+{
+    const char* shots = std::getenv("ND_SCREENSHOTS");
+    if (!shots)
+        GTEST_SKIP() << "set ND_SCREENSHOTS to a directory for the pictures";
+    const int32_t wolf = SystemWithMember(*sky, "Wolf 630 A");
+    const int32_t alula = SystemWithMember(*sky, "Alula Australis");
+    ASSERT_GE(wolf, 0);
+    ASSERT_GE(alula, 0);
+    RecordingHandler help;
+    StarInfoWindow window(BPoint(120, 150), "Star Info", &help);
+    window.setAttribute(Qt::WA_DeleteOnClose, false);
+    StarIView* view = window.View();
+    const auto settled = [view] { return view->HWTIsDone() && view->IsSuspended(); };
+    SendUniverse(*view);
+    Drop(*view, wolf, 20);
+    Drop(*view, alula, 150);
+    ASSERT_TRUE(QTest::qWaitFor(settled, 120000));
+    DeliverPostedMessages();
+    EXPECT_TRUE(window.grab().save(QString(shots) + "/star-info-wolf630.png"));
+    Drop(*view, sirius, 20);
+    ASSERT_TRUE(QTest::qWaitFor(settled, 120000));
+    DeliverPostedMessages();
+    EXPECT_TRUE(window.grab().save(QString(shots) + "/star-info-after.png"));
+}

@@ -1,6 +1,7 @@
 // The star information terminal, driven without its thread: the headers, filling the two slots by
 // message and by drop, what is typed where, what is retyped when, dragging systems out and the
 // help line for the half under the mouse.
+#include "CommaLocale.h"
 #include "info/StarInfoScreen.h"
 #include "query/UniverseBuilder.h"
 
@@ -469,34 +470,108 @@ TEST_F(StarIViewTest, LongTextsAreCut)
         Format("%.1f %s", -10.5 + 5 * std::log10(d / 10), "K1.5III").substr(0, 10));
 }
 
-TEST_F(StarIViewTest, MembersBeyondTheThirdTypeOnTheFollowingRows)
+TEST_F(StarIViewTest, MoreThanThreeMembersListTheFirstThreeAndCountTheRest)
 {
     SendUniverse();
     DropUpper(five);
     TypeAll(*view);
-    for (int32_t i = 0; i < 5; i++)
-        EXPECT_EQ(ScreenText(*view, 2 + i, 4, 23), Format("Member %d", i + 1)) << i;
-    EXPECT_EQ(ScreenRow(*view, 5), Star1Row(five, 3));
-    // The fifth lands on the distance row, whose end is cleared while slot 2 is empty.
-    EXPECT_EQ(ScreenText(*view, 6, 28, 10), "");
+    const Star* third = universe.SystemAt(five)->StarAt(2);
+    EXPECT_EQ(ScreenRow(*view, 2), Star1Row(five, 0));
+    EXPECT_EQ(ScreenRow(*view, 3), Star1Row(five, 1));
+    EXPECT_EQ(ScreenRow(*view, 4),
+        RowOf({ { 0, " C:" }, { 4, "Member 3  +2" }, { 28, ClassText(third) },
+            { 40, LuminosityText(third) } }));
+    // Nothing typed below the block, and the headers stand where they were.
+    for (int32_t row : { 0, 1, 5, 6, 7, 8, 9, 10, 11, 12 })
+        EXPECT_EQ(ScreenRow(*view, row), HeaderRow(row)) << "row " << row;
 
-    // Four members in the Star 2 block: the fourth's row lies below the screen, and each of its
-    // two moves there (name, then magnitude and class) scrolls the screen up one row.
+    // Four members in the Star 2 block: three rows and one more, nothing scrolls.
     DropLower(quad);
     TypeAll(*view);
-    EXPECT_EQ(ScreenRow(*view, 0), Star1Row(five, 0));
-    for (int32_t i = 0; i < 4; i++)
-        EXPECT_EQ(ScreenText(*view, 8 + i, 4, 23), Format("Member %d", i + 1)) << i;
-    EXPECT_EQ(ScreenText(*view, 12, 4, 23), "Member 4");
     const double d = Distance(five, quad);
     const auto apparent = [&](int32_t i) {
         const Star* star = universe.SystemAt(quad)->StarAt(i);
         return Format("%.1f %s", star->GetMagnitude() + 5 * std::log10(d / 10),
             star->GetSpectralClassString());
     };
-    EXPECT_EQ(ScreenText(*view, 12, 28, 10), apparent(3));
-    // The row the first scroll left the fourth name on keeps the third member's magnitude.
-    EXPECT_EQ(ScreenText(*view, 11, 28, 10), apparent(2));
+    const std::string star1Third = ScreenRow(*view, 4);
+    EXPECT_EQ(star1Third,
+        RowOf({ { 0, " C:" }, { 4, "Member 3  +2" }, { 28, ClassText(third) },
+            { 40, LuminosityText(third) } }));
+    for (int32_t row : { 0, 1 })
+        EXPECT_EQ(ScreenRow(*view, row), HeaderRow(row)) << "row " << row;
+    EXPECT_EQ(ScreenRow(*view, 2), Star1Row(five, 0));
+    EXPECT_EQ(ScreenRow(*view, 3), Star1Row(five, 1));
+    for (int32_t row : { 5, 7, 8, 9 })
+        EXPECT_EQ(ScreenRow(*view, row), HeaderRow(row)) << "row " << row;
+    EXPECT_EQ(ScreenText(*view, 6, 0, 12), "  DISTANCE:");
+    EXPECT_EQ(ScreenText(*view, 10, 0, 40),
+        RowOf({ { 0, " A:" }, { 4, "Member 1" }, { 28, apparent(0) } }));
+    EXPECT_EQ(ScreenText(*view, 11, 0, 40),
+        RowOf({ { 0, " B:" }, { 4, "Member 2" }, { 28, apparent(1) } }));
+    EXPECT_EQ(ScreenText(*view, 12, 0, 52),
+        RowOf({ { 0, " C:" }, { 4, "Member 3  +1" }, { 28, apparent(2) } }));
+
+    // Systems of fewer members after them leave every row clean: no mark, no fragment.
+    DropUpper(sirius);
+    DropLower(sun);
+    TypeAll(*view);
+    EXPECT_EQ(ScreenRow(*view, 2), Star1Row(sirius, 0));
+    EXPECT_EQ(ScreenRow(*view, 3), Star1Row(sirius, 1));
+    EXPECT_EQ(ScreenRow(*view, 4), HeaderRow(4));
+    EXPECT_EQ(ScreenText(*view, 10, 0, 40),
+        RowOf({ { 0, " A:" }, { 4, "The Sun" },
+            { 28, Format("%.1f %s", 4.83 + 5 * std::log10(Distance(sirius, sun) / 10), "G2V") } }));
+    EXPECT_EQ(ScreenText(*view, 11, 0, 40), " B:");
+    EXPECT_EQ(ScreenRow(*view, 12), HeaderRow(12));
+    for (int32_t row : { 0, 1, 5, 7, 8, 9 })
+        EXPECT_EQ(ScreenRow(*view, row), HeaderRow(row)) << "row " << row;
+}
+
+TEST_F(StarIViewTest, ALongNameOfTheThirdOfManyMembersIsShortenedForTheCount)
+{
+    Universe sky(4);
+    const int32_t many = AddTestSystem(sky, 1, 0, 0,
+        { { "A", "M0V", 9 }, { "B", "M0V", 9 }, { "A Name Far Too Long For Its Field", "M0V", 9 },
+            { "D", "M0V", 9 } });
+    Message message(kUniversePointer);
+    message.AddPointer(kUniversePtrString, &sky);
+    view->MessageReceived(&message);
+    DropUpper(many);
+    TypeAll(*view);
+    EXPECT_EQ(ScreenText(*view, 4, 4, 24), "A Name Far Too Long  +1");
+}
+
+TEST_F(StarIViewTest, NamesWithAccentsAreSpelledInAsciiLetters)
+{
+    Universe sky(4);
+    // Two real names with accents, in UTF-8: HD 8574 and HD 130322.
+    const int32_t belenos
+        = AddTestSystem(sky, 1, 0, 0, { { "B\xc3\xa9l\xc3\xa9nos", "F8V", 3.7 } });
+    const int32_t monch = AddTestSystem(sky, 5, 0, 0, { { "M\xc3\xb6nch", "K0V", 5.7 } });
+    Message message(kUniversePointer);
+    message.AddPointer(kUniversePtrString, &sky);
+    view->MessageReceived(&message);
+    DropUpper(belenos);
+    DropLower(monch);
+    TypeAll(*view);
+    EXPECT_EQ(ScreenText(*view, 2, 0, 28), " A: Belenos");
+    EXPECT_EQ(ScreenText(*view, 10, 0, 28), " A: Monch");
+}
+
+TEST_F(StarIViewTest, NumbersAreWrittenWithAPointInADecimalCommaLocale)
+{
+    const CommaLocale comma;
+    ASSERT_TRUE(comma.Active()) << "the de_DE.UTF-8 locale is missing: run scripts/setup";
+    SendUniverse();
+    DropUpper(near);
+    DropLower(far);
+    TypeAll(*view);
+    EXPECT_EQ(ScreenText(*view, 6, 12, 40), "10.00 parsecs ( 32.60 light-years )");
+    EXPECT_EQ(ScreenText(*view, 2, 28, 24), RowOf({ { 0, "4.7 G2V" }, { 12, "1.000000" } }));
+    EXPECT_EQ(ScreenText(*view, 11, 28, 10), "5.1 G5V");
+    EXPECT_EQ(ScreenText(*view, 10, 41, 11), "3h  7.4m");
+    EXPECT_EQ(ScreenText(*view, 11, 40, 12), "-28d 41.1'");
 }
 
 TEST_F(StarIViewTest, APressDragsTheSystemOfTheHalfUnderIt)
