@@ -1,5 +1,5 @@
-// The drag handle of a query panel: pressed, it runs the panel's query and drags the result
-// away, if anything matched.
+// The drag handle of a query panel: pressed, it runs the panel's query, says on the help line
+// how many systems it found, and drags the result away, if anything matched.
 #pragma once
 
 #include "query/panels/DragHandle.h"
@@ -16,5 +16,9 @@ protected:
     void MouseMoved(QPoint where, Transit transit) override;
 
 private:
+    // "No star systems found", "1 star system found", "12 star systems found" on the help line,
+    // until the mouse next comes over a control.
+    void TellFound(int32_t found);
+
     StarQueryView* owner;
 };

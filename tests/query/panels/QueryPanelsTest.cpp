@@ -17,6 +17,7 @@
 
 #include <QDragEnterEvent>
 #include <QDropEvent>
+#include <QFontMetrics>
 #include <QLabel>
 #include <QMenu>
 #include <cmath>
@@ -473,4 +474,56 @@ TEST_F(PanelTest, TheHandleSitsAtTheRightEdgeAndExplainsItself)
     EXPECT_STREQ(
         help.received[1].FindString(kInfoStringField), "Drag this to another view to find stars");
     EXPECT_EQ(help.received[2].what, kClearInfoMessage);
+}
+
+namespace {
+
+// The help line of the control window, as wide as it is there, that a panel sends its help to.
+class HelpLine {
+public:
+    HelpLine() { line.ISetTarget(&line); }
+
+    // What the line shows once the posted help has arrived, checked against the pixels of a
+    // line that was given that text directly, and that the text fits the line.
+    std::string Shown()
+    {
+        DeliverPostedMessages();
+        const QString text = line.text();
+        InfoView drawn(BRect(2, 32, 317, 44), "Drawn", "");
+        drawn.setText(text);
+        EXPECT_EQ(line.grab().toImage(), drawn.grab().toImage());
+        EXPECT_LE(QFontMetrics(line.font()).horizontalAdvance(text), line.width())
+            << text.toStdString();
+        return text.toStdString();
+    }
+
+    InfoView line { BRect(2, 32, 317, 44), "Info View", "" };
+};
+
+} // namespace
+
+TEST_F(PanelTest, APressOfTheHandleSaysHowManySystemsItFound)
+{
+    HelpLine help;
+    NameQueryView panel(kFrame, "Name Query", &universe, nullptr);
+    panel.ISetTarget(&help.line);
+
+    panel.starName->SetText("Nowhere");
+    EXPECT_FALSE(PressHandle(&panel).has_value());
+    EXPECT_EQ(help.Shown(), "No star systems found");
+
+    panel.starName->SetText("the sun");
+    EXPECT_TRUE(PressHandle(&panel).has_value());
+    EXPECT_EQ(help.Shown(), "1 star system found");
+
+    Choose(panel.queryType, 1); // contains
+    panel.starName->SetText("i");
+    EXPECT_TRUE(PressHandle(&panel).has_value());
+    ASSERT_GE(panel.GetSelectedItems(), 2);
+    EXPECT_EQ(help.Shown(), std::to_string(panel.GetSelectedItems()) + " star systems found");
+
+    // The handle's own help is still what it shows when the mouse next comes over it.
+    EXPECT_STREQ(panel.Dragger()->IGetInfo(), "Drag this to another view to find stars");
+    Enter(panel.Dragger());
+    EXPECT_EQ(help.Shown(), "Drag this to another view to find stars");
 }
