@@ -258,16 +258,25 @@ void HRDView::paintEvent(QPaintEvent*)
 
 void HRDView::dragEnterEvent(QDragEnterEvent* event)
 {
-    AcceptMessageDrag(event);
+    dragMoveEvent(event);
 }
 
 void HRDView::dragMoveEvent(QDragMoveEvent* event)
 {
-    AcceptMessageDrag(event);
+    // What was dragged out of this view is not taken back: a click would otherwise drop the
+    // view's own contents on it again.
+    if (DroppedOnItsSource(event, this))
+        event->ignore();
+    else
+        AcceptMessageDrag(event);
 }
 
 void HRDView::dropEvent(QDropEvent* event)
 {
+    if (DroppedOnItsSource(event, this)) {
+        event->ignore();
+        return;
+    }
     Message message;
     if (TakeDroppedMessage(event, this, &message))
         MessageReceived(&message);

@@ -269,16 +269,25 @@ void StarIView::mousePressEvent(QMouseEvent* event)
 
 void StarIView::dragEnterEvent(QDragEnterEvent* event)
 {
-    AcceptMessageDrag(event);
+    dragMoveEvent(event);
 }
 
 void StarIView::dragMoveEvent(QDragMoveEvent* event)
 {
-    AcceptMessageDrag(event);
+    // What was dragged out of this view is not taken back: a click would otherwise drop the
+    // view's own contents on it again.
+    if (DroppedOnItsSource(event, this))
+        event->ignore();
+    else
+        AcceptMessageDrag(event);
 }
 
 void StarIView::dropEvent(QDropEvent* event)
 {
+    if (DroppedOnItsSource(event, this)) {
+        event->ignore();
+        return;
+    }
     Message message;
     if (TakeDroppedMessage(event, this, &message))
         MessageReceived(&message);

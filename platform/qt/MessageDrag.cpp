@@ -7,6 +7,7 @@
 #include <QCoreApplication>
 #include <QDrag>
 #include <QDropEvent>
+#include <QPointer>
 #include <QWidget>
 #include <QWindow>
 
@@ -52,6 +53,28 @@ private:
     QRegion fShape; // the picture's opaque pixels, in its own (device-independent) pixels
 };
 
+// The view whose drag is running, for drops that Qt does not tell the source of (a drag handed
+// to a starter). Drags run on the application's thread only, one at a time.
+QPointer<const QWidget>& DragSource()
+{
+    static QPointer<const QWidget> source;
+    return source;
+}
+
+// Notes source as the running drag's for as long as it lives.
+class DragUnderWay {
+public:
+    explicit DragUnderWay(const QWidget* source)
+        : fPrevious(DragSource())
+    {
+        DragSource() = source;
+    }
+    ~DragUnderWay() { DragSource() = fPrevious; }
+
+private:
+    QPointer<const QWidget> fPrevious;
+};
+
 } // namespace
 
 MessageMimeData::MessageMimeData(const Message& message)
@@ -86,15 +109,17 @@ Qt::DropAction DragMessage(QWidget* source, const Message& message, RBitmap8* im
 Qt::DropAction DragMessage(QWidget* source, MessageMimeData* data, RBitmap8* image, BPoint hotSpot)
 {
     QDrag* drag = MakeMessageDrag(source, data, image, hotSpot);
+    const DragUnderWay running(source);
     return drag->exec(Qt::CopyAction);
 }
 
 void StartMessageDrag(const DragStarter& starter, QWidget* source, const Message& message,
     RBitmap8* image, BPoint hotSpot)
 {
-    if (starter)
+    if (starter) {
+        const DragUnderWay running(source);
         starter(message, image, hotSpot);
-    else
+    } else
         DragMessage(source, message, image, hotSpot);
 }
 
@@ -122,4 +147,12 @@ bool TakeDroppedMessage(QDropEvent* event, QWidget* receiver, Message* message)
     message->SetDropped(BPoint(static_cast<float>(screen.x()), static_cast<float>(screen.y())));
     event->acceptProposedAction();
     return true;
+}
+
+bool DroppedOnItsSource(const QDropEvent* event, const QWidget* receiver)
+{
+    const QWidget* source = qobject_cast<const QWidget*>(event->source());
+    if (!source)
+        source = DragSource();
+    return source && receiver && (source == receiver || receiver->isAncestorOf(source));
 }

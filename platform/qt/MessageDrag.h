@@ -60,3 +60,10 @@ void AcceptMessageDrag(QDragMoveEvent* event);
 // The dropped message, marked as dropped at the drop point in screen coordinates; false, and
 // the drop refused, when the event carries anything but a message.
 bool TakeDroppedMessage(QDropEvent* event, QWidget* receiver, Message* message);
+
+// Whether a drop lands back on the view its drag started from (the receiver itself or a widget
+// inside it): a press let go where it began, or a drag that never left its view. Views whose
+// drops add what they carry refuse such a drop, so that a click does not add their own contents
+// to them again. The source is the running drag's, whether Qt runs it or a starter was handed
+// it (StartMessageDrag and DragMessage note it for as long as the drag runs).
+bool DroppedOnItsSource(const QDropEvent* event, const QWidget* receiver);

@@ -471,3 +471,40 @@ TEST_F(HRDViewTest, AMagnitudeThatIsNoNumberOrAbsurdIsKeptButNotDrawn)
     EXPECT_TRUE(CanvasIsEmpty());
     EXPECT_EQ(view->FindPlot(BPoint(150, 150)), nullptr);
 }
+
+TEST_F(HRDViewTest, AClickOrADragLetGoOverTheDiagramItselfPlotsNothingMore)
+{
+    SendUniverse();
+    SendSet({ sun, vega });
+    Send(kStarMessage, kSystemIndexString, sirius);
+    const int32_t plotted = view->PlotCount();
+    const int32_t kept = view->PlottedSystems()->CountItems(true);
+    bool taken = true;
+
+    // A click on empty space: the set's drag starts and is let go where it began.
+    view->SetDragStarter(LetGoOver(view.get(), QPoint(150, 150), taken));
+    PressMouse(view.get(), QPoint(150, 150));
+    EXPECT_FALSE(taken);
+    EXPECT_EQ(view->PlotCount(), plotted);
+    EXPECT_EQ(view->PlottedSystems()->CountItems(true), kept);
+
+    // A marker dragged a little way and let go over the diagram.
+    taken = true;
+    view->SetDragStarter(LetGoOver(view.get(), MarkerOf(vega) + QPoint(30, 10), taken));
+    PressMouse(view.get(), MarkerOf(vega));
+    EXPECT_FALSE(taken);
+    EXPECT_EQ(view->PlotCount(), plotted);
+
+    // Another diagram's drag let go here is plotted.
+    HRDView other(BPoint(0, 0), "Other");
+    Message universeMessage(kUniversePointer);
+    universeMessage.AddPointer(kUniversePtrString, &universe);
+    other.MessageReceived(&universeMessage);
+    Message star(kStarMessage);
+    star.AddInt32(kSystemIndexString, vega);
+    other.MessageReceived(&star);
+    other.SetDragStarter(LetGoOver(view.get(), QPoint(150, 150), taken));
+    PressMouse(&other, MarkerOf(vega));
+    EXPECT_TRUE(taken);
+    EXPECT_EQ(view->PlotCount(), plotted + 1);
+}

@@ -21,6 +21,7 @@
 #include <memory>
 #include <optional>
 #include <string>
+#include <vector>
 
 namespace {
 
@@ -665,4 +666,42 @@ TEST_F(StarIViewTest, TheRememberedHalfIsOneForEveryView)
     DeliverPostedMessages();
     EXPECT_TRUE(otherHelp.received.empty());
     EXPECT_STREQ(other.IGetInfo(), "Drop star here");
+}
+
+TEST_F(StarIViewTest, ASystemDraggedOutAndLetGoOverTheViewItselfChangesNothing)
+{
+    SendUniverse();
+    DropUpper(sirius);
+    DropLower(far);
+    TypeAll(*view);
+    std::vector<std::string> before;
+    for (int32_t row = 0; row < view->Rows(); row++)
+        before.push_back(ScreenRow(*view, row));
+    bool taken = true;
+
+    // Star 1 dragged down to the lower half, and Star 2 clicked where it is.
+    view->SetDragStarter(LetGoOver(view.get(), QPoint(100, 150), taken));
+    PressMouse(view.get(), QPoint(100, 30));
+    EXPECT_FALSE(taken);
+    PressMouse(view.get(), QPoint(100, 150));
+    EXPECT_FALSE(taken);
+    EXPECT_EQ(view->Index1(), sirius);
+    EXPECT_EQ(view->Index2(), far);
+    EXPECT_EQ(view->PendingBytes(), 0) << "something was typed";
+    TypeAll(*view);
+    for (int32_t row = 0; row < view->Rows(); row++)
+        EXPECT_EQ(ScreenRow(*view, row), before[size_t(row)]) << "row " << row;
+
+    // Another view's system let go over the lower half goes there.
+    StarIView other(BPoint(0, 0), "Other View");
+    Message universeMessage(kUniversePointer);
+    universeMessage.AddPointer(kUniversePtrString, &universe);
+    other.MessageReceived(&universeMessage);
+    Message star(kStarMessage);
+    star.AddInt32(kSystemIndexString, near);
+    other.MessageReceived(&star);
+    other.SetDragStarter(LetGoOver(view.get(), QPoint(100, 150), taken));
+    PressMouse(&other, QPoint(100, 30));
+    EXPECT_TRUE(taken);
+    EXPECT_EQ(view->Index2(), near);
 }

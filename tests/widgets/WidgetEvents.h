@@ -8,6 +8,8 @@
 #include "render/RBitmap8.h"
 
 #include <QCoreApplication>
+#include <QDragEnterEvent>
+#include <QDropEvent>
 #include <QEnterEvent>
 #include <QMouseEvent>
 #include <QWidget>
@@ -88,5 +90,27 @@ inline DragStarter CatchDrag(std::optional<CaughtDrag>& caught)
 {
     return [&caught](const Message& message, RBitmap8* image, BPoint hotSpot) {
         caught = CaughtDrag { message, Pixels(*image), hotSpot };
+    };
+}
+
+// A drag starter that lets the drag go at where over target, as a hand would let the button go
+// there: the target sees the drag come in, move and, if it lets it, be dropped. taken (which
+// must outlive its use) tells whether the target took the drop.
+inline DragStarter LetGoOver(QWidget* target, QPoint where, bool& taken)
+{
+    return [target, where, &taken](const Message& message, RBitmap8*, BPoint) {
+        taken = false;
+        MessageMimeData data(message);
+        QDragEnterEvent enter(where, Qt::CopyAction, &data, Qt::LeftButton, Qt::NoModifier);
+        QCoreApplication::sendEvent(target, &enter);
+        if (!enter.isAccepted())
+            return;
+        QDragMoveEvent move(where, Qt::CopyAction, &data, Qt::LeftButton, Qt::NoModifier);
+        QCoreApplication::sendEvent(target, &move);
+        if (!move.isAccepted())
+            return;
+        QDropEvent drop(QPointF(where), Qt::CopyAction, &data, Qt::LeftButton, Qt::NoModifier);
+        QCoreApplication::sendEvent(target, &drop);
+        taken = drop.isAccepted();
     };
 }

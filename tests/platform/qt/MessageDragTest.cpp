@@ -93,3 +93,36 @@ TEST(MessageDrag, ForeignDropsAreRefused)
     files.setUrls({ QUrl::fromLocalFile("/tmp/stars.dat") });
     EXPECT_EQ(DraggedMessage(&files), nullptr);
 }
+
+TEST(MessageDrag, ADropKnowsWhenItLandsBackOnTheViewItsDragStartedFrom)
+{
+    QWidget window, other;
+    auto* view = new QWidget(&window);
+    auto* handle = new QWidget(view);
+    const Message message(kStarMessage);
+    MessageMimeData data(message);
+    QDropEvent drop(QPointF(5, 5), Qt::CopyAction, &data, Qt::LeftButton, Qt::NoModifier);
+
+    // No drag runs: no drop is on its source.
+    EXPECT_FALSE(DroppedOnItsSource(&drop, view));
+
+    // While the view's own drag runs, handed to a starter: the view and what holds it are its
+    // source, other views are not.
+    int asked = 0;
+    const DragStarter starter = [&](const Message&, RBitmap8*, BPoint) {
+        asked++;
+        EXPECT_TRUE(DroppedOnItsSource(&drop, view));
+        EXPECT_TRUE(DroppedOnItsSource(&drop, &window));
+        EXPECT_FALSE(DroppedOnItsSource(&drop, handle));
+        EXPECT_FALSE(DroppedOnItsSource(&drop, &other));
+    };
+    StartMessageDrag(starter, view, message, nullptr, BPoint(0, 0));
+    EXPECT_EQ(asked, 1);
+    // A drag from the handle inside the view lands on its source over the view too.
+    const DragStarter fromHandle
+        = [&](const Message&, RBitmap8*, BPoint) { EXPECT_TRUE(DroppedOnItsSource(&drop, view)); };
+    StartMessageDrag(fromHandle, handle, message, nullptr, BPoint(0, 0));
+
+    // Once the drag is over, nothing is its source any more.
+    EXPECT_FALSE(DroppedOnItsSource(&drop, view));
+}
