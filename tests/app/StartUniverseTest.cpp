@@ -491,6 +491,52 @@ TEST(ThreeDNightdomeAppStart, AMillionAndOneStarsAreReadToTheLimitAndSaidOnTheHe
     UniverseWindow::SetRenderThreadCount(0);
 }
 
+// The whole program object started on flawed catalogues: what standard error and the control
+// window's help line say, and that the line holds it.
+TEST(ThreeDNightdomeAppStart, FlawsOfTheCatalogueAreSaidOnStandardErrorAndTheHelpLine)
+{
+    QTemporaryDir dir;
+    const fs::path longName = fs::path(dir.filePath("stars.dat").toStdString());
+    Write(longName, Stars(8) + std::string(5000, 'N') + "\nG2V 4.8 9 0 0\n" + Stars(3));
+    const fs::path program = QCoreApplication::applicationFilePath().toStdString();
+    struct Case {
+        fs::path catalogue;
+        std::string error;
+        std::string helpLine;
+        bool empty;
+    };
+    const Case cases[] = {
+        { longName,
+            "nightdome: '" + longName.string()
+                + "', line 17: a name longer than 500 characters; 9 records malformed\n",
+            "stars.dat, line 17: name too long; 9 bad records", false },
+        { program,
+            "nightdome: '" + program.string()
+                + "' holds NUL bytes, which no text does: it is not a star catalogue; starting "
+                  "with an empty sky\n",
+            program.filename().string() + " is not a star catalogue: the sky is empty", true },
+    };
+    for (const Case& c : cases) {
+        StartOptions options;
+        options.catalogue = c.catalogue.string();
+        options.threads = 1;
+        int argc = 1;
+        char name[] = "nightdome";
+        char* argv[] = { name, nullptr };
+        testing::internal::CaptureStderr();
+        auto* application = new ThreeDNightdomeApp(argc, argv, options);
+        const std::string error = testing::internal::GetCapturedStderr();
+        ControlWindow* controls = application->GetControlWindow();
+        EXPECT_NE(error.find(c.error), std::string::npos) << error;
+        const InfoView* line = controls->GetInfoView();
+        EXPECT_EQ(line->text().toStdString(), c.helpLine);
+        EXPECT_LE(QFontMetrics(line->font()).horizontalAdvance(line->text()), line->width());
+        EXPECT_EQ(controls->GetUniverse()->IsEmpty(), c.empty);
+        delete application;
+        UniverseWindow::SetRenderThreadCount(0);
+    }
+}
+
 // The real program: --help needs no display, a mistake exits with 2, and a catalogue that
 // cannot be read is one line on standard error while the program comes up with an empty sky.
 TEST(ProgramCommandLine, TheProgramAnswersFromTheCommandLine)
