@@ -194,16 +194,53 @@ TEST_F(HRDWindowTest, ThePlotNameLineWritesNumbersWithAPointInADecimalCommaLocal
     EXPECT_EQ(window->PlotName()->text(), "Vega ( 0.6 A0.0 )");
 }
 
+namespace {
+
+// Watches every message the application delivers for one that names a given handler.
+class HandlerWatch : public QObject {
+public:
+    explicit HandlerWatch(const void* handler)
+        : fHandler(handler)
+    {
+        // Filters installed last see events first: this one comes before the dispatcher.
+        Message nothing;
+        PostMessage(QCoreApplication::instance(), nothing);
+        DeliverPostedMessages();
+        QCoreApplication::instance()->installEventFilter(this);
+    }
+    ~HandlerWatch() override { QCoreApplication::instance()->removeEventFilter(this); }
+
+    bool named = false;
+
+protected:
+    bool eventFilter(QObject*, QEvent* event) override
+    {
+        if (event->type() == MessageEvent::EventType()
+            && static_cast<MessageEvent*>(event)->message.FindPointer(kSIHandlerPtrString)
+                == fHandler)
+            named = true;
+        return false;
+    }
+
+private:
+    const void* fHandler;
+};
+
+} // namespace
+
 TEST_F(HRDWindowTest, AWindowClosedBeforeTheChartGetsItsSubscriptionIsNotSubscribed)
 {
     Universe* universe = MakeUniverse({ { "The Sun", 0, 0, 0, 4.83 },
         { "Vega", 1, 4, -5, 0.58, "A0V" }, { "Sirius", -0.5, -0.8, 2.5, 1.43, "A1V" } });
     UniverseView* chart = MakeView(universe);
     auto window = std::make_unique<HRDWindow>(BPoint(150, 150), "H-R Diagram", &help);
+    const HandlerWatch watch(static_cast<QObject*>(window->View()));
     window->FollowSelection(chart);
-    // Closed while the request still waits in the chart's queue.
+    // Closed while the request still waits in the chart's queue: the chart is never handed a
+    // pointer to it, and subscribes nothing.
     window.reset();
     DeliverPostedMessages();
+    EXPECT_FALSE(watch.named) << "the chart was handed the closed diagram";
     EXPECT_EQ(chart->subscribers.CountItems(), 0);
 
     // The chart's next selection goes nowhere.
