@@ -13,14 +13,24 @@
 //
 // BM_List100k/<list>: those 100,000 systems dropped on Equals of an empty list, shown or
 // painted as above.
+//
+// BM_CsvDrop/<when>/<set>: a CSV file of a set (the 100,000 systems, about 112,000 rows; or
+// the whole universe, about 1,125,000 rows) dropped as a file on Equals of a shown list, up to
+// the list having been painted. "first": a new window, so the universe's name and position
+// index is built too; "again": a window that has read a drop before.
 #include "bench/MillionSystems.h"
 #include "bench/WidgetBenchMain.h"
 #include "core/MessageCodes.h"
 #include "lists/DropPad.h"
 #include "lists/ListWindow.h"
 #include "lists/StarListView.h"
+#include "query/SystemSetCsv.h"
 #include "widgets/IButton.h"
 
+#include <QFile>
+#include <QMimeData>
+#include <QTemporaryDir>
+#include <QUrl>
 #include <memory>
 #include <random>
 #include <string>
@@ -155,6 +165,66 @@ void BM_Drop(benchmark::State& state, const Case& c)
         state.SkipWithError("the list was not painted");
 }
 
+// The set written as a CSV file once, kept for the rest of the run.
+QString CsvFile(const StarSysMask& set, const char* name)
+{
+    static QTemporaryDir folder;
+    const QString path = folder.filePath(QString::fromLatin1(name));
+    if (!QFile::exists(path)) {
+        QFile file(path);
+        const std::string text = SystemSetCsv::Write(MillionSystems(), set);
+        if (!file.open(QIODevice::WriteOnly)
+            || file.write(text.data(), qint64(text.size())) != qint64(text.size()))
+            return QString();
+    }
+    return path;
+}
+
+// Drops the file on target as a file manager's drag ending there does.
+void DropFile(QWidget* target, const QString& path)
+{
+    QMimeData data;
+    data.setUrls({ QUrl::fromLocalFile(path) });
+    const QPoint middle(target->width() / 2, target->height() / 2);
+    QDragEnterEvent enter(middle, Qt::CopyAction, &data, Qt::LeftButton, Qt::NoModifier);
+    QCoreApplication::sendEvent(target, &enter);
+    QDropEvent drop(QPointF(middle), Qt::CopyAction, &data, Qt::LeftButton, Qt::NoModifier);
+    QCoreApplication::sendEvent(target, &drop);
+}
+
+void BM_CsvDrop(benchmark::State& state, bool first, const StarSysMask& (*dropped)())
+{
+    const QString path = CsvFile(dropped(), dropped == AllSystems ? "all.csv" : "found.csv");
+    if (path.isEmpty()) {
+        state.SkipWithError("the CSV file could not be written");
+        return;
+    }
+    auto under = std::make_unique<ListUnderTest>(true);
+    if (!first) {
+        DropFile(under->list->Pad("Equals"), path);
+        under->Settle();
+    }
+    bool painted = true;
+    for (auto _ : state) {
+        state.PauseTiming();
+        if (first) {
+            under.reset();
+            under = std::make_unique<ListUnderTest>(true);
+        } else {
+            DropMessage(under->list->Pad("Equals"), SetMessage(Nothing()));
+            under->Settle();
+        }
+        state.ResumeTiming();
+        DropFile(under->list->Pad("Equals"), path);
+        painted = under->Settle() && painted;
+    }
+    state.counters["set"] = under->list->Count();
+    if (under->list->Count() != dropped().CountItems(true))
+        state.SkipWithError("the list does not hold the set dropped");
+    if (!painted)
+        state.SkipWithError("the list was not painted");
+}
+
 // Qt's warning that the offscreen platform has no window manager to pass a fixed window size
 // to, given for every list switched off, is left out of the report.
 QtMessageHandler qtMessageHandler = nullptr;
@@ -183,5 +253,18 @@ int main(int argc, char** argv)
         for (const char* until : { "shown", "painted" })
             add(std::string("BM_List100k/") + until,
                 { true, until[0] == 'p', "Equals", Nothing, SearchResult });
+        struct Dropped {
+            const char* name;
+            const StarSysMask& (*set)();
+        };
+        for (const bool first : { true, false }) {
+            for (const Dropped& d :
+                { Dropped { "100k", SearchResult }, Dropped { "all", AllSystems } }) {
+                benchmark::RegisterBenchmark(
+                    (std::string("BM_CsvDrop/") + (first ? "first/" : "again/") + d.name).c_str(),
+                    BM_CsvDrop, first, d.set)
+                    ->Unit(benchmark::kMillisecond);
+            }
+        }
     });
 }

@@ -56,7 +56,8 @@ bool CsvDrop::AcceptCopy(QDropEvent* event)
     return true;
 }
 
-bool CsvDrop::Take(const QMimeData* data, std::vector<Table>* tables, QString* error)
+bool CsvDrop::Take(
+    const QMimeData* data, std::vector<Table>* tables, QString* errorLabel, QString* error)
 {
     tables->clear();
     const QStringList files = LocalFiles(data);
@@ -64,22 +65,22 @@ bool CsvDrop::Take(const QMimeData* data, std::vector<Table>* tables, QString* e
         QFile file(path);
         const QFileInfo info(path);
         // The help line names the file; its folder would crowd out the reason.
-        const QString name = info.fileName();
+        *errorLabel = info.fileName();
         if (info.isDir()) {
-            *error = name + QStringLiteral(": a folder, not a CSV file");
+            *error = QStringLiteral(": a folder, not a CSV file");
             return false;
         }
         if (!file.open(QIODevice::ReadOnly)) {
-            *error = name + QStringLiteral(": ") + file.errorString();
+            *error = QStringLiteral(": ") + file.errorString();
             return false;
         }
         if (file.size() > kMaxFileBytes) {
-            *error = name + QStringLiteral(": larger than 512 MiB, too large for a star list");
+            *error = QStringLiteral(": over 512 MiB, too large for a list");
             return false;
         }
-        Table table { name, file.readAll() };
+        Table table { *errorLabel, file.readAll() };
         if (file.error() != QFileDevice::NoError) {
-            *error = name + QStringLiteral(": ") + file.errorString();
+            *error = QStringLiteral(": ") + file.errorString();
             return false;
         }
         tables->push_back(std::move(table));
@@ -97,6 +98,7 @@ bool CsvDrop::Take(const QMimeData* data, std::vector<Table>* tables, QString* e
             return true;
         }
     }
+    errorLabel->clear();
     *error = QStringLiteral("the drop holds no CSV");
     return false;
 }

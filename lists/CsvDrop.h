@@ -32,9 +32,11 @@ public:
     // file manager is never moved away; false, refusing it, when copying is not offered.
     static bool AcceptCopy(QDropEvent* event);
 
-    // The tables data carries: every local file read whole, else the CSV text. False, with
-    // error naming the file and the reason, when a file cannot be read.
-    static bool Take(const QMimeData* data, std::vector<Table>* tables, QString* error);
+    // The tables data carries: every local file read whole, else the CSV text. False when a
+    // file cannot be read, with errorLabel the file's name and error the reason, which
+    // follows the name on the help line (": No such file or directory").
+    static bool Take(
+        const QMimeData* data, std::vector<Table>* tables, QString* errorLabel, QString* error);
 
     // Hands a drop on receiver to handler: one of this program's messages as the message
     // marked dropped, CSV as a kCsvDropMessage (handled before this returns, while the drop's

@@ -5,6 +5,7 @@
 #include "core/MessageCodes.h"
 #include "lists/CsvDrop.h"
 #include "lists/DropPad.h"
+#include "lists/LongWork.h"
 #include "lists/SetCsvSaver.h"
 #include "lists/StarDragger.h"
 #include "lists/StarListView.h"
@@ -14,10 +15,13 @@
 #include "widgets/InfoView.h"
 #include "widgets/WidgetGeometry.h"
 
+#include <QCloseEvent>
 #include <QContextMenuEvent>
 #include <QDragEnterEvent>
 #include <QDropEvent>
 #include <QFontMetrics>
+#include <QLabel>
+#include <QLocale>
 #include <QMenu>
 #include <QShortcut>
 #include <algorithm>
@@ -61,6 +65,7 @@ ListWindow::ListWindow(BPoint where, float width, float height, const char* titl
     , frameWidth(width)
     , savedHeight(height)
     , fInfoTarget(infoTarget)
+    , fLongWork(std::make_unique<LongWork>(this))
 {
     setAttribute(Qt::WA_DeleteOnClose);
     setWindowTitle(QString::fromUtf8(title));
@@ -116,6 +121,15 @@ ListWindow::ListWindow(BPoint where, float width, float height, const char* titl
     show();
 }
 
+void ListWindow::closeEvent(QCloseEvent* event)
+{
+    // Closed in the middle of a long drop or save, the window would go from under it.
+    if (fLongWork->Busy())
+        event->ignore();
+    else
+        QWidget::closeEvent(event);
+}
+
 ListWindow::~ListWindow()
 {
     // The list reads the mask while it goes.
@@ -141,6 +155,10 @@ void ListWindow::SetHeightLimits()
 
 void ListWindow::MessageReceived(Message* message)
 {
+    // While a long drop is read the window still runs its events; nothing else may change
+    // the list meanwhile.
+    if (fLongWork->Busy())
+        return;
     const bool tagged = message->HasInt32(kDropTagField);
     const auto tag = uint32_t(message->FindInt32(kDropTagField));
     switch (message->what) {
@@ -208,51 +226,159 @@ void ListWindow::ShowCount()
     countView->setText(QString::fromUtf8(text));
 }
 
+void ListWindow::ShowReport(const QString& label, const QString& rest, const QString& lines)
+{
+    // The help line is one line of a few hundred pixels: the line numbers go first, then the
+    // middle of the file's name, then whatever does not fit at the end.
+    QString text = label + rest + lines;
+    if (auto* line = qobject_cast<const QLabel*>(fInfoTarget.data())) {
+        const QFontMetrics metrics(line->font());
+        const int room = line->width();
+        const int fixed = metrics.horizontalAdvance(rest);
+        if (metrics.horizontalAdvance(text) > room) {
+            if (metrics.horizontalAdvance(label) + fixed <= room)
+                text = label + rest
+                    + metrics.elidedText(
+                        lines, Qt::ElideRight, room - metrics.horizontalAdvance(label) - fixed);
+            else if (fixed < room)
+                text = metrics.elidedText(label, Qt::ElideMiddle, room - fixed) + rest;
+            else
+                text = metrics.elidedText(label + rest, Qt::ElideRight, room);
+        }
+    }
+    fCsvReport = text;
+    Message info(kInfoMessage);
+    info.AddString(kInfoStringField, text.toUtf8().constData());
+    PostMessage(fInfoTarget, info);
+    HoldReport();
+}
+
+void ListWindow::HoldReport()
+{
+    // The pointer is still over the pad the file was dropped on, whose help would replace the
+    // report at once: the window's own help stays off the line until the pointer leaves it.
+    for (IBroadcaster* broadcaster : Broadcasters())
+        broadcaster->ISetTarget(nullptr);
+    fReportHeld = true;
+}
+
+void ListWindow::leaveEvent(QEvent* event)
+{
+    QWidget::leaveEvent(event);
+    if (!fReportHeld)
+        return;
+    fReportHeld = false;
+    for (IBroadcaster* broadcaster : Broadcasters())
+        broadcaster->ISetTarget(fInfoTarget);
+    PostMessage(fInfoTarget, Message(kClearInfoMessage));
+}
+
+std::vector<IBroadcaster*> ListWindow::Broadcasters() const
+{
+    std::vector<IBroadcaster*> all { countView, showListBox, listView, starDragger };
+    for (const PadEntry& entry : kPads)
+        all.push_back(Pad(entry.name));
+    return all;
+}
+
 bool ListWindow::DropCsv(const QMimeData* data, bool tagged, uint32_t tag)
 {
-    auto report = [this](const QString& text) {
-        fCsvReport = text;
-        Message info(kInfoMessage);
-        info.AddString(kInfoStringField, text.toUtf8().constData());
-        PostMessage(fInfoTarget, info);
-    };
-    std::vector<CsvDrop::Table> tables;
-    QString error;
-    if (!CsvDrop::Take(data, &tables, &error)) {
-        report(error);
+    auto tables = std::make_shared<std::vector<CsvDrop::Table>>();
+    QString label, error;
+    if (!CsvDrop::Take(data, tables.get(), &label, &error)) {
+        ShowReport(label, error);
         return false;
     }
-    if (!fMatcher)
-        fMatcher = SystemMatcher::Shared(universe);
-    // Several files make one set; they are all read before the list changes.
-    StarSysMask found(systemCount, false, 0), one(systemCount, false, 0);
-    SystemSetCsvResult total;
-    total.ok = true;
-    for (const CsvDrop::Table& table : tables) {
-        const std::string label = table.label.toStdString();
-        const SystemSetCsvResult result = SystemSetCsv::Read(
-            std::string_view(table.text.constData(), size_t(table.text.size())), *fMatcher, &one);
-        if (!result.ok) {
-            report(QString::fromStdString(SystemSetCsv::Describe(result, label)));
-            return false;
+    label = tables->size() == 1 ? tables->front().label
+                                : QStringLiteral("%1 CSV files").arg(tables->size());
+    // Matching a few hundred thousand rows, and indexing the universe before the first drop,
+    // takes seconds: it is done on a thread of its own, into a set of its own, and the list
+    // changes only once all of it has been read.
+    struct Reading {
+        explicit Reading(int32_t systems)
+            : found(systems, false, 0)
+        {
         }
-        found += one;
-        total.rows += result.rows;
-        total.matchedRows += result.matchedRows;
-        total.unmatchedLines.insert(
-            total.unmatchedLines.end(), result.unmatchedLines.begin(), result.unmatchedLines.end());
+        std::shared_ptr<const SystemMatcher> matcher;
+        StarSysMask found;
+        SystemSetCsvResult total;
+        QString failed; // the table that could not be read, with why in total.error
+    };
+    auto reading = std::make_shared<Reading>(systemCount);
+    reading->matcher = fMatcher;
+    const Universe* sky = universe;
+    const bool read
+        = fLongWork->Run(QStringLiteral("Reading %1\u2026").arg(label), [reading, tables, sky] {
+              if (!reading->matcher)
+                  reading->matcher = SystemMatcher::Shared(sky);
+              // Several files make one set; they are all read before the list changes.
+              StarSysMask one(reading->found.GetSystemCount(), false, 0);
+              SystemSetCsvResult& total = reading->total;
+              total.ok = true;
+              for (const CsvDrop::Table& table : *tables) {
+                  const SystemSetCsvResult result = SystemSetCsv::Read(
+                      std::string_view(table.text.constData(), size_t(table.text.size())),
+                      *reading->matcher, &one);
+                  if (!result.ok) {
+                      total = result;
+                      reading->failed = table.label;
+                      return;
+                  }
+                  reading->found += one;
+                  total.rows += result.rows;
+                  total.matchedRows += result.matchedRows;
+                  total.unmatchedLines.insert(total.unmatchedLines.end(),
+                      result.unmatchedLines.begin(), result.unmatchedLines.end());
+              }
+              total.systems = reading->found.CountItems(true);
+          });
+    if (!read) {
+        ShowReport(label, QStringLiteral(": cancelled, the list is unchanged"));
+        return false;
     }
-    total.systems = found.CountItems(true);
-    const std::string label = tables.size() == 1 ? tables[0].label.toStdString()
-                                                 : std::to_string(tables.size()) + " CSV files";
-    DropSet(&found, tagged, tag);
-    report(QString::fromStdString(SystemSetCsv::Describe(total, label)));
+    fMatcher = reading->matcher;
+    if (!reading->total.ok) {
+        ShowReport(
+            reading->failed, QStringLiteral(", ") + QString::fromStdString(reading->total.error));
+        return false;
+    }
+    DropSet(&reading->found, tagged, tag);
+    ReportRead(label, reading->total);
     return true;
+}
+
+void ListWindow::ReportRead(const QString& label, const SystemSetCsvResult& total)
+{
+    const size_t unmatched = total.unmatchedLines.size();
+    if (unmatched == 0) {
+        // "label: n systems from m rows".
+        ShowReport(label, QString::fromStdString(SystemSetCsv::Describe(total, "")));
+        return;
+    }
+    // The rows that named no system say most; the help line has room for a few of their lines.
+    constexpr size_t kShown = 5;
+    const QLocale english(QLocale::English);
+    QString rest = QStringLiteral(": %1 %2").arg(english.toString(total.systems),
+        total.systems == 1 ? QStringLiteral("system") : QStringLiteral("systems"));
+    QStringList numbers;
+    for (size_t i = 0; i < unmatched && i < kShown; i++)
+        numbers << QString::number(total.unmatchedLines[i]);
+    QString lines;
+    if (unmatched <= kShown) {
+        rest += unmatched == 1 ? QStringLiteral("; no match on line ")
+                               : QStringLiteral("; no match on lines ");
+        lines = numbers.join(QStringLiteral(", "));
+    } else {
+        rest += QStringLiteral("; %1 rows unmatched").arg(english.toString(qulonglong(unmatched)));
+        lines = QStringLiteral(" (") + numbers.join(QStringLiteral(", "))
+            + QStringLiteral(", \u2026)");
+    }
+    ShowReport(label, rest, lines);
 }
 
 bool ListWindow::SaveAsCsv()
 {
-    return SetCsvSaver::Save(this, *universe, *mask);
+    return !fLongWork->Busy() && SetCsvSaver::Save(this, *universe, *mask, fLongWork.get());
 }
 
 void ListWindow::contextMenuEvent(QContextMenuEvent* event)

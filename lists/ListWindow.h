@@ -11,13 +11,17 @@
 #include "platform/qt/Messaging.h"
 #include "query/StarSysMask.h"
 #include "query/SystemMatcher.h"
+#include "query/SystemSetCsv.h"
 
 #include <QPointer>
 #include <QString>
 #include <QWidget>
 #include <memory>
+#include <vector>
 
 class DropPad;
+class IBroadcaster;
+class LongWork;
 class ICheckBox;
 class InfoView;
 class QAction;
@@ -73,6 +77,8 @@ protected:
     void dragMoveEvent(QDragMoveEvent* event) override;
     void dropEvent(QDropEvent* event) override;
     void contextMenuEvent(QContextMenuEvent* event) override;
+    void leaveEvent(QEvent* event) override;
+    void closeEvent(QCloseEvent* event) override;
 
 private:
     void DropSet(const StarSysMask* set, bool tagged, uint32_t tag);
@@ -81,6 +87,13 @@ private:
     // way the help line says what happened. False when nothing was read.
     bool DropCsv(const QMimeData* data, bool tagged, uint32_t tag);
     void ShowCount();
+    // Puts label + rest + lines on the help line, shortened to fit it (lines first, then the
+    // middle of label), and keeps it there until the pointer leaves the window.
+    void ShowReport(const QString& label, const QString& rest, const QString& lines = QString());
+    // What a CSV read found, labelled with the file's name.
+    void ReportRead(const QString& label, const SystemSetCsvResult& total);
+    void HoldReport();
+    std::vector<IBroadcaster*> Broadcasters() const;
     // Makes the count line wide enough for every count up to a million in the window's font.
     void WidenCountView();
     // Fixes the height (list hidden) or lets it go from 120 up (list shown).
@@ -93,4 +106,6 @@ private:
     std::shared_ptr<const SystemMatcher> fMatcher; // taken at the first CSV drop, then kept
     QString fCsvReport;
     bool fCsvDrag = false; // the drag over the window offers CSV rather than a message
+    std::unique_ptr<LongWork> fLongWork; // large drops and saves
+    bool fReportHeld = false; // a CSV report stands on the help line; the widgets keep quiet
 };

@@ -1,13 +1,17 @@
 // The save dialog, the all-or-nothing write and its failure message.
 #include "lists/SetCsvSaver.h"
 
+#include "lists/LongWork.h"
 #include "query/SystemSetCsv.h"
 
 #include <QDir>
 #include <QFileDialog>
+#include <QFileInfo>
 #include <QMessageBox>
 #include <QSaveFile>
 #include <QStandardPaths>
+#include <memory>
+#include <string>
 
 std::function<QString(QWidget*, const QString&)> SetCsvSaver::chooseFile = AskForFile;
 
@@ -54,15 +58,26 @@ bool SetCsvSaver::Write(const QString& path, const QByteArray& bytes, QString* e
     return true;
 }
 
-bool SetCsvSaver::Save(QWidget* parent, const Universe& universe, const StarSysMask& set)
+bool SetCsvSaver::Save(
+    QWidget* parent, const Universe& universe, const StarSysMask& set, LongWork* work)
 {
     const QString chosen = chooseFile ? chooseFile(parent, SuggestedPath()) : QString();
     if (chosen.isEmpty())
         return false;
     const QString path = WithCsvSuffix(chosen);
-    const std::string text = SystemSetCsv::Write(universe, set);
+    // A large set takes seconds to put into words: that is done on a thread, from a copy of
+    // the set, and nothing is written until it is done (a cancelled save leaves no file).
+    auto copy = std::make_shared<StarSysMask>(set.GetSystemCount(), false, 0);
+    *copy = set;
+    auto text = std::make_shared<std::string>();
+    const Universe* sky = &universe;
+    auto write = [copy, text, sky] { *text = SystemSetCsv::Write(*sky, *copy); };
+    if (!work)
+        write();
+    else if (!work->Run(QStringLiteral("Writing %1\u2026").arg(QFileInfo(path).fileName()), write))
+        return false;
     QString error;
-    if (Write(path, QByteArray(text.data(), qsizetype(text.size())), &error))
+    if (Write(path, QByteArray(text->data(), qsizetype(text->size())), &error))
         return true;
     if (showError)
         showError(parent, error);

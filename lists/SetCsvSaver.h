@@ -9,6 +9,7 @@
 #include <QString>
 #include <functional>
 
+class LongWork;
 class QWidget;
 
 class SetCsvSaver {
@@ -23,8 +24,10 @@ public:
     static std::function<void(QWidget* parent, const QString& text)> showError;
 
     // Asks where, then writes set (of universe) there; ".csv" is added to a name without it.
-    // False when cancelled or when writing failed (after saying why).
-    static bool Save(QWidget* parent, const Universe& universe, const StarSysMask& set);
+    // The table is made under work (a progress dialog and Cancel once it takes a while) when
+    // given. False when cancelled or when writing failed (after saying why).
+    static bool Save(QWidget* parent, const Universe& universe, const StarSysMask& set,
+        LongWork* work = nullptr);
 
     // Writes bytes to path through a temporary file that replaces it only once complete.
     // False, with error naming the file and the reason, when that fails.

@@ -3,10 +3,12 @@
 // help line's report of rows that matched nothing and of files that could not be read.
 #include "query/UniverseBuilder.h"
 
+#include "controls/ControlsOnTwoStars.h"
 #include "core/MessageCodes.h"
 #include "lists/CsvDrop.h"
 #include "lists/DropPad.h"
 #include "lists/ListWindow.h"
+#include "lists/LongWork.h"
 #include "lists/SetCsvSaver.h"
 #include "lists/SetMimeData.h"
 #include "lists/StarDragger.h"
@@ -17,6 +19,7 @@
 #include "query/panels/TextControl.h"
 #include "render/SpectralTables.h"
 #include "resources/ResourceData.h"
+#include "widgets/IButton.h"
 #include "widgets/InfoView.h"
 #include "widgets/WidgetEvents.h"
 
@@ -32,12 +35,16 @@
 #include <QLineEdit>
 #include <QMenu>
 #include <QMimeData>
+#include <QProgressDialog>
+#include <QPushButton>
 #include <QStandardPaths>
 #include <QTemporaryDir>
 #include <QTest>
 #include <QTimer>
 #include <QUrl>
 
+#include <chrono>
+#include <future>
 #include <gtest/gtest.h>
 #include <memory>
 #include <random>
@@ -456,8 +463,7 @@ TEST_F(ListCsvTest, UnmatchedRowsAreReportedInTheHelpLine)
         "Name\r\nS1\r\nNobody\r\nS2\r\n\"Multi\r\nline\"\r\nS3\r\nGhost\r\n");
     ASSERT_TRUE(DropFile(list->Pad("Plus"), path));
     EXPECT_EQ(Members(*list->Mask()), (std::vector<int32_t> { 1, 2, 3 }));
-    const std::string report
-        = "some.csv: 3 systems from 6 rows; 3 rows matched nothing (lines 3, 5, 8)";
+    const std::string report = "some.csv: 3 systems; no match on lines 3, 5, 8";
     EXPECT_EQ(list->CsvReport().toStdString(), report);
     const auto texts = HelpTexts();
     ASSERT_FALSE(texts.empty());
@@ -507,6 +513,196 @@ TEST_F(ListCsvTest, UnreadableOrMalformedFilesChangeNothing)
     ASSERT_TRUE(Drop(list->Pad("Equals"), &two));
     EXPECT_EQ(Members(*list->Mask()), (std::vector<int32_t> { 0, 1 }));
     EXPECT_EQ(list->CsvReport(), QStringLiteral("2 CSV files: 2 systems from 2 rows"));
+}
+
+TEST_F(ListCsvTest, TheReportStaysOnTheHelpLineUntilThePointerLeaves)
+{
+    ControlsOnTwoStars program;
+    auto* list = program.Open<ListWindow>("New List Window Button");
+    ASSERT_NE(list, nullptr);
+    InfoView* line = program.controls.GetInfoView();
+    DropPad* plus = list->Pad("Plus");
+    Enter(plus);
+    DeliverPostedMessages();
+    ASSERT_EQ(line->text().toStdString(), "Drop Pad: Add to list");
+
+    ASSERT_TRUE(DropCsvText(plus, "Name\r\nSirius\r\nNobody\r\nThe Sun\r\n"));
+    DeliverPostedMessages();
+    const QString report = QStringLiteral("Dropped CSV: 2 systems; no match on line 3");
+    EXPECT_EQ(list->CsvReport().toStdString(), report.toStdString());
+    EXPECT_EQ(line->text().toStdString(), report.toStdString());
+    // The drag over, the pointer is over the pad again, then moves on over the window.
+    for (QWidget* over : std::initializer_list<QWidget*> { plus, list->Pad("Minus"),
+             list->countView, list->showListBox, list->listView, list->starDragger }) {
+        Enter(over);
+        MoveMouse(over, QPoint(3, 3));
+        Leave(over);
+        DeliverPostedMessages();
+        EXPECT_EQ(line->text().toStdString(), report.toStdString())
+            << over->objectName().toStdString();
+    }
+    // Out of the window: the line clears, and the window's help is back when the pointer is.
+    Leave(list);
+    DeliverPostedMessages();
+    EXPECT_EQ(line->text().toStdString(), "");
+    Enter(list->Pad("XOR"));
+    DeliverPostedMessages();
+    EXPECT_EQ(line->text().toStdString(), "Drop Pad: Logical XOR");
+}
+
+TEST_F(ListCsvTest, EveryHelpTextOfTheListFitsTheHelpLine)
+{
+    ControlsOnTwoStars program;
+    auto* list = program.Open<ListWindow>("New List Window Button");
+    ASSERT_NE(list, nullptr);
+    InfoView* line = program.controls.GetInfoView();
+    const QFontMetrics metrics(line->font());
+    std::vector<IBroadcaster*> widgets { list->countView, list->listView, list->starDragger };
+    for (const char* pad : { "Plus", "Equals", "Minus", "NOT", "AND", "OR", "XOR" })
+        widgets.push_back(list->Pad(pad));
+    for (IBroadcaster* widget : widgets) {
+        ASSERT_TRUE(widget->IBroadcastInfo());
+        DeliverPostedMessages();
+        ASSERT_EQ(line->text().toStdString(), widget->IGetInfo());
+        EXPECT_LE(metrics.horizontalAdvance(line->text()), line->width()) << widget->IGetInfo();
+    }
+
+    // Reports of CSV drops, with long names and many rows that match nothing: the counts stay,
+    // the line numbers and the middle of the name give way.
+    QByteArray many = "Name\r\nSirius\r\n";
+    for (int i = 0; i < 40; i++)
+        many += "Nobody " + QByteArray::number(i) + "\r\n";
+    struct Case {
+        QString name;
+        QByteArray text;
+        QString start, end;
+    };
+    const Case cases[] = {
+        { "stars.csv", many, "stars.csv: 1 system; 40 rows unmatched (3, 4, ", "" },
+        { "the nearest stars to the sun within twenty parsecs, as found on a tuesday.csv", many,
+            "the near", ": 1 system; 40 rows unmatched" },
+        { "numbers.csv", "1,2\r\n3,4\r\n", "numbers.csv, line 1: the header names", "" },
+        { "missing.csv", "", "missing.csv: No such file or directory", "" },
+    };
+    for (const Case& c : cases) {
+        const QString path = c.text.isEmpty() ? folder.filePath(c.name) : WriteFile(c.name, c.text);
+        Leave(list);
+        ASSERT_TRUE(DropFile(list->Pad("Plus"), path));
+        DeliverPostedMessages();
+        EXPECT_EQ(line->text().toStdString(), list->CsvReport().toStdString());
+        EXPECT_LE(metrics.horizontalAdvance(line->text()), line->width())
+            << line->text().toStdString();
+        EXPECT_TRUE(line->text().startsWith(c.start)) << line->text().toStdString();
+        EXPECT_TRUE(line->text().endsWith(c.end)) << line->text().toStdString();
+    }
+    EXPECT_EQ(list->Count(), 1);
+}
+
+// Holds the list's long work on its thread until the progress dialog it shows has been seen
+// (and, with cancel, its Cancel button clicked), the way a drop or a save that takes seconds
+// goes for the user.
+class HeldWork {
+public:
+    explicit HeldWork(QWidget* window, bool cancel)
+    {
+        LongWork::showAfter = 0;
+        std::shared_future<void> released = fRelease.get_future().share();
+        LongWork::beforeWork = [released] {
+            // Bounded: a dialog that never comes fails the test instead of hanging it.
+            released.wait_for(std::chrono::seconds(20));
+        };
+        fWatch.setInterval(10);
+        QObject::connect(&fWatch, &QTimer::timeout, [this, window, cancel] {
+            auto* dialog = window->findChild<QProgressDialog*>();
+            if (fReleased || !dialog || !dialog->isVisible()) {
+                fTicksWithoutDialog += !fReleased;
+                return;
+            }
+            // The window's thread is still serving events while the work runs.
+            if (++fTicksShown < 3)
+                return;
+            label = dialog->labelText();
+            if (cancel) {
+                auto* button = dialog->findChild<QPushButton*>();
+                if (button)
+                    QTest::mouseClick(button, Qt::LeftButton);
+            }
+            fReleased = true;
+            fRelease.set_value();
+        });
+        fWatch.start();
+    }
+
+    ~HeldWork()
+    {
+        if (!fReleased)
+            fRelease.set_value();
+        LongWork::beforeWork = nullptr;
+        LongWork::showAfter = 500;
+    }
+
+    bool Shown() const { return fTicksShown >= 3; }
+    QString label; // what the dialog said
+
+private:
+    std::promise<void> fRelease;
+    QTimer fWatch;
+    bool fReleased = false;
+    int fTicksShown = 0, fTicksWithoutDialog = 0;
+};
+
+TEST_F(ListCsvTest, ALongDropShowsProgressAndCancelLeavesTheList)
+{
+    const auto universe = NamedUniverse(3000);
+    auto list = NewList(universe.get());
+    Fill(list.get(), { 1, 2 });
+    auto source = NewList(universe.get());
+    Fill(source.get(), { 5, 50, 500, 2999 });
+    chosenPath = folder.filePath(QStringLiteral("four.csv"));
+    ASSERT_TRUE(source->SaveAsCsv());
+    {
+        HeldWork held(list.get(), true);
+        ASSERT_TRUE(DropFile(list->Pad("Equals"), chosenPath));
+        EXPECT_TRUE(held.Shown());
+        EXPECT_EQ(held.label.toStdString(), "Reading four.csv\u2026");
+    }
+    EXPECT_EQ(Members(*list->Mask()), (std::vector<int32_t> { 1, 2 }));
+    EXPECT_EQ(list->Count(), 2);
+    EXPECT_EQ(list->listView->Model()->rowCount(), 2);
+    EXPECT_EQ(list->CsvReport().toStdString(), "four.csv: cancelled, the list is unchanged");
+    EXPECT_EQ(list->findChild<QProgressDialog*>(), nullptr) << "the dialog is gone";
+    {
+        HeldWork held(list.get(), false);
+        ASSERT_TRUE(DropFile(list->Pad("Equals"), chosenPath));
+        EXPECT_TRUE(held.Shown());
+    }
+    EXPECT_EQ(Members(*list->Mask()), (std::vector<int32_t> { 5, 50, 500, 2999 }));
+    EXPECT_EQ(list->CsvReport().toStdString(), "four.csv: 4 systems from 4 rows");
+}
+
+TEST_F(ListCsvTest, ALongSaveShowsProgressAndCancelLeavesNoFile)
+{
+    const auto universe = NamedUniverse(3000);
+    auto list = NewList(universe.get());
+    Fill(list.get(), { 7, 70, 700 });
+    chosenPath = folder.filePath(QStringLiteral("three.csv"));
+    {
+        HeldWork held(list.get(), true);
+        EXPECT_FALSE(list->SaveAsCsv());
+        EXPECT_TRUE(held.Shown());
+        EXPECT_EQ(held.label.toStdString(), "Writing three.csv\u2026");
+    }
+    EXPECT_FALSE(QFile::exists(chosenPath));
+    EXPECT_TRUE(errors.isEmpty());
+    {
+        HeldWork held(list.get(), false);
+        EXPECT_TRUE(list->SaveAsCsv());
+        EXPECT_TRUE(held.Shown());
+    }
+    StarSysMask three(universe->CountItems(), false, 0);
+    for (const int32_t i : { 7, 70, 700 })
+        three.SetStateSafe(i, true);
+    EXPECT_EQ(ReadFile(chosenPath).toStdString(), SystemSetCsv::Write(*universe, three));
 }
 
 TEST_F(ListCsvTest, TextFieldsTakeTextButNotTheListsTable)
