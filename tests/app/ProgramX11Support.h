@@ -44,12 +44,13 @@ inline const QPoint kDistanceField(130 + 20, kPanelRow);
 // The panels' mode menus: "is", "is less than", "is greater than".
 constexpr int kModeCount = 3, kLessThan = 1;
 
-// A list window's drop pads, its handle and its count line.
+// A list window's drop pads, its handle and its count line (as far as the check box: the line
+// reaches past 100 pixels so that counts of many digits show whole).
 inline const QPoint kEqualsPad(40 + 16, 16);
 inline const QPoint kNotPad(2 + 16, 34 + 8);
 inline const QPoint kAndPad(42 + 16, 34 + 8);
 inline const QPoint kStarDragger(188 + 16, 10 + 16);
-inline const QRect kCountLine(0, 54, 101, 13);
+inline const QRect kCountLine(0, 54, 150, 13);
 
 // Runs xdotool to its end (no drag of ours runs meanwhile) and returns what it printed.
 inline QString RunXdotool(const QStringList& arguments)
