@@ -136,16 +136,25 @@ void AcceptSingleSystems(QDragMoveEvent* event)
 
 void StarQueryView::dragEnterEvent(QDragEnterEvent* event)
 {
-    AcceptSingleSystems(event);
+    dragMoveEvent(event);
 }
 
 void StarQueryView::dragMoveEvent(QDragMoveEvent* event)
 {
-    AcceptSingleSystems(event);
+    // The panel's own result is not taken back: let go over the panel it came from, a single
+    // system would rewrite the fields that found it.
+    if (DroppedOnItsSource(event, this))
+        event->ignore();
+    else
+        AcceptSingleSystems(event);
 }
 
 void StarQueryView::dropEvent(QDropEvent* event)
 {
+    if (DroppedOnItsSource(event, this)) {
+        event->ignore();
+        return;
+    }
     Message message;
     if (TakeDroppedMessage(event, this, &message))
         MessageReceived(&message);

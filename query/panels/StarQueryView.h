@@ -1,7 +1,8 @@
 // A query panel of the find window: a framed box whose controls fill in the parameters of one
 // query, and a drag handle at its right edge. Pressing the handle runs the query over the whole
 // universe; whatever matched is dragged away as one system ('StaR') or a set ('SAry'). A single
-// system dropped on the panel fills its controls from that system.
+// system dropped on the panel fills its controls from that system, unless it comes from the
+// panel's own handle.
 #pragma once
 
 #include "catalog/Universe.h"

@@ -527,3 +527,48 @@ TEST_F(PanelTest, APressOfTheHandleSaysHowManySystemsItFound)
     Enter(panel.Dragger());
     EXPECT_EQ(help.Shown(), "Drag this to another view to find stars");
 }
+
+TEST_F(PanelTest, AResultLetGoOverItsOwnPanelChangesNothing)
+{
+    NameQueryView panel(kFrame, "Name Query", &universe, nullptr);
+    panel.show();
+    Choose(panel.queryType, 2); // starts with
+    panel.starName->SetText("siri");
+    // The drag, while it runs: the pointer goes from the handle over the panel's controls in
+    // small steps and the button is let go there, the panel hearing what a drag tells a view
+    // it passes over.
+    bool entered = true, moved = true, dropped = true;
+    std::optional<Message> carried;
+    QueryDragger* handle = panel.Dragger();
+    handle->SetDragStarter([&](const Message& message, RBitmap8*, BPoint) {
+        carried = message;
+        MessageMimeData data(message);
+        QPoint at = handle->geometry().center();
+        QDragEnterEvent enter(at, Qt::CopyAction, &data, Qt::LeftButton, Qt::NoModifier);
+        QCoreApplication::sendEvent(&panel, &enter);
+        entered = enter.isAccepted();
+        for (int step = 0; step < 10; step++) {
+            at -= QPoint(12, step % 2);
+            QDragMoveEvent move(at, Qt::CopyAction, &data, Qt::LeftButton, Qt::NoModifier);
+            QCoreApplication::sendEvent(&panel, &move);
+            moved = moved && move.isAccepted();
+        }
+        QDropEvent drop(QPointF(at), Qt::CopyAction, &data, Qt::LeftButton, Qt::NoModifier);
+        QCoreApplication::sendEvent(&panel, &drop);
+        dropped = drop.isAccepted();
+    });
+    PressMouse(handle, QPoint(5, 5));
+    ASSERT_TRUE(carried.has_value());
+    EXPECT_EQ(carried->what, kStarMessage);
+    EXPECT_EQ(carried->FindInt32(kSystemIndexString), sirius);
+    EXPECT_FALSE(entered);
+    EXPECT_FALSE(moved);
+    EXPECT_FALSE(dropped);
+    // Not rewritten to "Sirius A", the name of the system found.
+    EXPECT_STREQ(panel.starName->Text(), "siri");
+    EXPECT_EQ(panel.queryType->MarkedIndex(), 2);
+
+    // Once that drag is over, a system dragged from elsewhere is taken again.
+    ASSERT_TRUE(DropSystem(&panel, tauCeti));
+    EXPECT_STREQ(panel.starName->Text(), "Tau Ceti");
+}
