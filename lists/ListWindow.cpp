@@ -5,6 +5,7 @@
 #include "core/MessageCodes.h"
 #include "lists/CsvDrop.h"
 #include "lists/DropPad.h"
+#include "lists/HelpLineReport.h"
 #include "lists/LongWork.h"
 #include "lists/SetCsvSaver.h"
 #include "lists/StarDragger.h"
@@ -20,8 +21,6 @@
 #include <QDragEnterEvent>
 #include <QDropEvent>
 #include <QFontMetrics>
-#include <QLabel>
-#include <QLocale>
 #include <QMenu>
 #include <QShortcut>
 #include <algorithm>
@@ -66,6 +65,7 @@ ListWindow::ListWindow(BPoint where, float width, float height, const char* titl
     , savedHeight(height)
     , fInfoTarget(infoTarget)
     , fLongWork(std::make_unique<LongWork>(this))
+    , fReport(infoTarget)
 {
     setAttribute(Qt::WA_DeleteOnClose);
     setWindowTitle(QString::fromUtf8(title));
@@ -226,51 +226,10 @@ void ListWindow::ShowCount()
     countView->setText(QString::fromUtf8(text));
 }
 
-void ListWindow::ShowReport(const QString& label, const QString& rest, const QString& lines)
-{
-    // The help line is one line of a few hundred pixels: the line numbers go first, then the
-    // middle of the file's name, then whatever does not fit at the end.
-    QString text = label + rest + lines;
-    if (auto* line = qobject_cast<const QLabel*>(fInfoTarget.data())) {
-        const QFontMetrics metrics(line->font());
-        const int room = line->width();
-        const int fixed = metrics.horizontalAdvance(rest);
-        if (metrics.horizontalAdvance(text) > room) {
-            if (metrics.horizontalAdvance(label) + fixed <= room)
-                text = label + rest
-                    + metrics.elidedText(
-                        lines, Qt::ElideRight, room - metrics.horizontalAdvance(label) - fixed);
-            else if (fixed < room)
-                text = metrics.elidedText(label, Qt::ElideMiddle, room - fixed) + rest;
-            else
-                text = metrics.elidedText(label + rest, Qt::ElideRight, room);
-        }
-    }
-    fCsvReport = text;
-    Message info(kInfoMessage);
-    info.AddString(kInfoStringField, text.toUtf8().constData());
-    PostMessage(fInfoTarget, info);
-    HoldReport();
-}
-
-void ListWindow::HoldReport()
-{
-    // The pointer is still over the pad the file was dropped on, whose help would replace the
-    // report at once: the window's own help stays off the line until the pointer leaves it.
-    for (IBroadcaster* broadcaster : Broadcasters())
-        broadcaster->ISetTarget(nullptr);
-    fReportHeld = true;
-}
-
 void ListWindow::leaveEvent(QEvent* event)
 {
     QWidget::leaveEvent(event);
-    if (!fReportHeld)
-        return;
-    fReportHeld = false;
-    for (IBroadcaster* broadcaster : Broadcasters())
-        broadcaster->ISetTarget(fInfoTarget);
-    PostMessage(fInfoTarget, Message(kClearInfoMessage));
+    fReport.Release();
 }
 
 std::vector<IBroadcaster*> ListWindow::Broadcasters() const
@@ -286,7 +245,7 @@ bool ListWindow::DropCsv(const QMimeData* data, bool tagged, uint32_t tag)
     auto tables = std::make_shared<std::vector<CsvDrop::Table>>();
     QString label, error;
     if (!CsvDrop::Take(data, tables.get(), &label, &error)) {
-        ShowReport(label, error);
+        fReport.Show(label, error, QString(), Broadcasters());
         return false;
     }
     label = tables->size() == 1 ? tables->front().label
@@ -333,47 +292,20 @@ bool ListWindow::DropCsv(const QMimeData* data, bool tagged, uint32_t tag)
               total.systems = reading->found.CountItems(true);
           });
     if (!read) {
-        ShowReport(label, QStringLiteral(": cancelled, the list is unchanged"));
+        fReport.Show(
+            label, QStringLiteral(": cancelled, the list is unchanged"), QString(), Broadcasters());
         return false;
     }
     fMatcher = reading->matcher;
     if (!reading->total.ok) {
-        ShowReport(
-            reading->failed, QStringLiteral(", ") + QString::fromStdString(reading->total.error));
+        fReport.Show(reading->failed,
+            QStringLiteral(", ") + QString::fromStdString(reading->total.error), QString(),
+            Broadcasters());
         return false;
     }
     DropSet(&reading->found, tagged, tag);
-    ReportRead(label, reading->total);
+    fReport.ShowRead(label, reading->total, Broadcasters());
     return true;
-}
-
-void ListWindow::ReportRead(const QString& label, const SystemSetCsvResult& total)
-{
-    const size_t unmatched = total.unmatchedLines.size();
-    if (unmatched == 0) {
-        // "label: n systems from m rows".
-        ShowReport(label, QString::fromStdString(SystemSetCsv::Describe(total, "")));
-        return;
-    }
-    // The rows that named no system say most; the help line has room for a few of their lines.
-    constexpr size_t kShown = 5;
-    const QLocale english(QLocale::English);
-    QString rest = QStringLiteral(": %1 %2").arg(english.toString(total.systems),
-        total.systems == 1 ? QStringLiteral("system") : QStringLiteral("systems"));
-    QStringList numbers;
-    for (size_t i = 0; i < unmatched && i < kShown; i++)
-        numbers << QString::number(total.unmatchedLines[i]);
-    QString lines;
-    if (unmatched <= kShown) {
-        rest += unmatched == 1 ? QStringLiteral("; no match on line ")
-                               : QStringLiteral("; no match on lines ");
-        lines = numbers.join(QStringLiteral(", "));
-    } else {
-        rest += QStringLiteral("; %1 rows unmatched").arg(english.toString(qulonglong(unmatched)));
-        lines = QStringLiteral(" (") + numbers.join(QStringLiteral(", "))
-            + QStringLiteral(", \u2026)");
-    }
-    ShowReport(label, rest, lines);
 }
 
 bool ListWindow::SaveAsCsv()

@@ -7,11 +7,11 @@
 #pragma once
 
 #include "catalog/Universe.h"
+#include "lists/HelpLineReport.h"
 #include "platform/BPoint.h"
 #include "platform/qt/Messaging.h"
 #include "query/StarSysMask.h"
 #include "query/SystemMatcher.h"
-#include "query/SystemSetCsv.h"
 
 #include <QPointer>
 #include <QString>
@@ -57,7 +57,7 @@ public:
     QMenu* ContextMenu() const { return fContextMenu; }
     QAction* SaveAction() const { return fSaveAction; }
     // What the last CSV drop did, as shown in the help line.
-    const QString& CsvReport() const { return fCsvReport; }
+    const QString& CsvReport() const { return fReport.Text(); }
 
     Universe* universe; // not owned
     int32_t systemCount; // the universe's, when the window was made
@@ -87,12 +87,7 @@ private:
     // way the help line says what happened. False when nothing was read.
     bool DropCsv(const QMimeData* data, bool tagged, uint32_t tag);
     void ShowCount();
-    // Puts label + rest + lines on the help line, shortened to fit it (lines first, then the
-    // middle of label), and keeps it there until the pointer leaves the window.
-    void ShowReport(const QString& label, const QString& rest, const QString& lines = QString());
-    // What a CSV read found, labelled with the file's name.
-    void ReportRead(const QString& label, const SystemSetCsvResult& total);
-    void HoldReport();
+    // The widgets that post help, to be kept quiet while a report stands on the help line.
     std::vector<IBroadcaster*> Broadcasters() const;
     // Makes the count line wide enough for every count up to a million in the window's font.
     void WidenCountView();
@@ -104,8 +99,7 @@ private:
     QMenu* fContextMenu; // a child
     QAction* fSaveAction; // the menu's
     std::shared_ptr<const SystemMatcher> fMatcher; // taken at the first CSV drop, then kept
-    QString fCsvReport;
     bool fCsvDrag = false; // the drag over the window offers CSV rather than a message
     std::unique_ptr<LongWork> fLongWork; // large drops and saves
-    bool fReportHeld = false; // a CSV report stands on the help line; the widgets keep quiet
+    HelpLineReport fReport; // what the last CSV drop did
 };
