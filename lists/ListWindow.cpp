@@ -156,8 +156,8 @@ void ListWindow::SetHeightLimits()
 void ListWindow::MessageReceived(Message* message)
 {
     // While a long drop is read the window still runs its events; nothing else may change
-    // the list meanwhile.
-    if (fLongWork->Busy())
+    // the set meanwhile, though the list may be switched off and on.
+    if (fLongWork->Busy() && message->what != kShowListChanged)
         return;
     const bool tagged = message->HasInt32(kDropTagField);
     const auto tag = uint32_t(message->FindInt32(kDropTagField));

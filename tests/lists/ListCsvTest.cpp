@@ -44,6 +44,7 @@
 #include <QUrl>
 
 #include <chrono>
+#include <functional>
 #include <future>
 #include <gtest/gtest.h>
 #include <memory>
@@ -603,7 +604,8 @@ TEST_F(ListCsvTest, EveryHelpTextOfTheListFitsTheHelpLine)
 // goes for the user.
 class HeldWork {
 public:
-    explicit HeldWork(QWidget* window, bool cancel)
+    // meanwhile: what the user does while the dialog is up, before the work goes on.
+    explicit HeldWork(QWidget* window, bool cancel, std::function<void()> meanwhile = nullptr)
     {
         LongWork::showAfter = 0;
         std::shared_future<void> released = fRelease.get_future().share();
@@ -612,7 +614,7 @@ public:
             released.wait_for(std::chrono::seconds(20));
         };
         fWatch.setInterval(10);
-        QObject::connect(&fWatch, &QTimer::timeout, [this, window, cancel] {
+        QObject::connect(&fWatch, &QTimer::timeout, [this, window, cancel, meanwhile] {
             auto* dialog = window->findChild<QProgressDialog*>();
             if (fReleased || !dialog || !dialog->isVisible()) {
                 fTicksWithoutDialog += !fReleased;
@@ -622,6 +624,8 @@ public:
             if (++fTicksShown < 3)
                 return;
             label = dialog->labelText();
+            if (meanwhile)
+                meanwhile();
             if (cancel) {
                 auto* button = dialog->findChild<QPushButton*>();
                 if (button)
@@ -678,6 +682,25 @@ TEST_F(ListCsvTest, ALongDropShowsProgressAndCancelLeavesTheList)
     }
     EXPECT_EQ(Members(*list->Mask()), (std::vector<int32_t> { 5, 50, 500, 2999 }));
     EXPECT_EQ(list->CsvReport().toStdString(), "four.csv: 4 systems from 4 rows");
+
+    // Meanwhile the set stays as it is, but the list may still be switched off.
+    {
+        auto* dropped = new StarSysMask(universe->CountItems(), false, 0);
+        const std::unique_ptr<StarSysMask> owned(dropped);
+        dropped->SetStateSafe(9, true);
+        HeldWork held(list.get(), false, [&] {
+            Message message(kStarArrayMessage);
+            message.AddPointer(kSystemArrayPtrString, dropped);
+            list->Pad("Plus")->MessageReceived(&message);
+            list->showListBox->click();
+            DeliverPostedMessages();
+        });
+        ASSERT_TRUE(DropFile(list->Pad("Minus"), chosenPath));
+        EXPECT_TRUE(held.Shown());
+    }
+    EXPECT_EQ(list->Count(), 0);
+    EXPECT_FALSE(list->ShowsList());
+    EXPECT_FALSE(list->showListBox->isChecked());
 }
 
 TEST_F(ListCsvTest, ALongSaveShowsProgressAndCancelLeavesNoFile)
