@@ -39,6 +39,7 @@ ThreeDNightdomeApp::ThreeDNightdomeApp(int& argc, char** argv, const StartOption
     QGuiApplication::setQuitOnLastWindowClosed(false);
     // Before the first window exists, so that every window is on the screen's default colormap.
     QCoreApplication::instance()->installEventFilter(&fColormaps);
+    QCoreApplication::instance()->installEventFilter(&fTrimmer);
     // The tables are written here, before any window or render thread exists, and only read
     // afterwards.
     gSpectralCTable = BuildSpectralTables();

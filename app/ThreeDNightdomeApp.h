@@ -2,6 +2,7 @@
 // the control window, which opens everything else.
 #pragma once
 
+#include "app/ClosedWindowTrimmer.h"
 #include "app/CommandLine.h"
 #include "app/DefaultColormapFilter.h"
 #include "controls/ControlWindow.h"
@@ -40,5 +41,6 @@ public:
 private:
     std::unique_ptr<QApplication> fApplication; // owned when this object made it
     DefaultColormapFilter fColormaps; // watches every window the program creates
+    ClosedWindowTrimmer fTrimmer; // watches every window close
     QPointer<ControlWindow> fControlWindow;
 };
