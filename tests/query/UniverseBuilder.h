@@ -25,3 +25,18 @@ inline int32_t AddTestSystem(
     universe.AddItem(system);
     return universe.CountItems() - 1;
 }
+
+// Three neighbours of the Sun at their places, for the window tests: the Sun, Sirius with its
+// white dwarf, and Vega, appended in that order.
+struct Neighbours {
+    int32_t sun, sirius, vega;
+};
+inline Neighbours AddNeighbours(Universe& universe)
+{
+    Neighbours n {};
+    n.sun = AddTestSystem(universe, 0, 0, 0, { { "The Sun", "G2V", 4.83 } });
+    n.sirius = AddTestSystem(universe, -0.494, -0.759, 2.477,
+        { { "Sirius", "A1V", 1.43 }, { "Sirius B", "DA2", 11.3 } });
+    n.vega = AddTestSystem(universe, 1.0, 4.9, -5.0, { { "Vega", "A0V", 0.58 } });
+    return n;
+}
