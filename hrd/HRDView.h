@@ -2,7 +2,8 @@
 // absolute magnitude (top to bottom, bright to faint), each a small marker on an empty diagram
 // drawn once, beforehand. Systems come by drag and drop or from a chart's selection; hovering
 // a marker names its star on the plot-name line; a press drags the marker's system out, or
-// every set dropped so far when there is no marker under the mouse.
+// every set dropped so far when there is no marker under the mouse. Such a drag let go over the
+// diagram itself (a click) adds nothing.
 #pragma once
 
 #include "catalog/SpectralClass.h"

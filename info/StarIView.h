@@ -1,7 +1,9 @@
 // The star information terminal: two star systems dropped on its halves ("Star 1" above, "Star 2"
 // below) are typed out with their members' classes and magnitudes, the first system's
 // luminosities, the distance between the two and how the second looks from the first: apparent
-// magnitudes, right ascension and declination. A system shown can be dragged out again.
+// magnitudes, right ascension and declination. A system shown can be dragged out again; let go
+// over this view itself, it changes nothing. A block lists three members of a system and counts
+// the rest.
 #pragma once
 
 #include "info/HWTerminal.h"
