@@ -115,10 +115,32 @@ TEST_P(CsvAcrossPrograms, AFileDroppedInAndTheListDraggedOut)
     // In: the file dragged from the other program onto the Equals pad.
     const unsigned long source = StartPeer(fSource, "source", file, kSourcePlace, "CSV Source");
     ASSERT_NE(source, 0u) << "the other program's source window did not show";
-    Drag(ClientArea(source).center(), list + kEqualsPad);
+    // The pointer stays over the pad after the drop, then wanders over the window and leaves.
+    RunXdotool(DragSteps(ClientArea(source).center(), list + kEqualsPad));
     const int read = countLine.WaitFor(list, 4);
     EXPECT_EQ(read, 4) << "the list's count line (-1 when it shows no number; "
                        << countLine.Difference(list, 4) << " pixels differ)";
+    // The control window's help line tells what the drop read, and keeps it while the pointer
+    // is over the list window, whose pads, count line and list have help of their own.
+    const QStringList helpTexts { "some stars.csv: 4 systems; no match on line 7", "",
+        "Drop Pad: Copy list" };
+    const LabelReader helpLine(QRect(2, 32, 316, 13), helpTexts, false);
+    const QPoint controls = ClientArea(WindowNamed("3D Nightdome")).topLeft();
+    EXPECT_EQ(helpLine.WaitFor(controls, 0), 0)
+        << helpLine.Difference(controls, 0) << " pixels differ from the report";
+    for (const QPoint over :
+        { kEqualsPad + QPoint(3, 2), kNotPad, QPoint(40, 60), QPoint(60, 120), kEqualsPad }) {
+        RunXdotool({ "mousemove", Number(list.x() + over.x()), Number(list.y() + over.y()), "sleep",
+            "0.3" });
+        EXPECT_EQ(helpLine.Read(controls), 0)
+            << "with the pointer at " << over.x() << ", " << over.y() << " of the list";
+    }
+    RestThePointer();
+    EXPECT_EQ(helpLine.WaitFor(controls, 1), 1) << "the line is cleared";
+    RunXdotool(
+        { "mousemove", Number(list.x() + kEqualsPad.x()), Number(list.y() + kEqualsPad.y()) });
+    EXPECT_EQ(helpLine.WaitFor(controls, 2), 2) << "the pads' help is back";
+    RestThePointer();
     ASSERT_TRUE(QTest::qWaitFor(
         [&] { return fSource.readAllStandardOutput().contains("drag ended, copied"); }, 10000))
         << "the other program's drag did not end as a copy";

@@ -1,6 +1,6 @@
 // Reads a line of text of the real program's windows off the screen: the line is matched against
 // this process's own rendering of each text it may show, drawn by a label of the same size and
-// the same font on the windows' grey.
+// the same font on the windows' grey (or the toolkit's window colour).
 #pragma once
 
 #include "ChartReaders.h"
@@ -15,12 +15,15 @@
 
 class LabelReader {
 public:
-    // area: where the line stands in its window's inside; texts: everything it may show.
-    LabelReader(QRect area, const QStringList& texts)
+    // area: where the line stands in its window's inside; texts: everything it may show;
+    // grey: whether the line stands on the windows' grey rather than the toolkit's own window
+    // colour (the control window's help line does).
+    LabelReader(QRect area, const QStringList& texts, bool grey = true)
         : fArea(area)
     {
         QWidget back;
-        PaintWindowGrey(&back);
+        if (grey)
+            PaintWindowGrey(&back);
         back.resize(area.size());
         QLabel line(&back);
         line.setGeometry(QRect(QPoint(0, 0), area.size()));
