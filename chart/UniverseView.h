@@ -92,6 +92,10 @@ public:
     // pausing it while the chart cannot be seen.
     void AttachedToWindow();
     void DetachedFromWindow();
+    // Tells the frame loop to end after the frame it is drawing, waking it from a pause or from
+    // its wait for the next frame, and returns at once; DetachedFromWindow then waits for it.
+    // A program closing many charts tells them all first, so that they finish side by side.
+    void StopRendering();
     void Resume();
     void Suspend();
     bool IsRunning() const { return running.load(); }
@@ -99,6 +103,9 @@ public:
     bool IsSuspended() const { return fSuspended.load(); }
     // Frames finished since the loop started; for tests and measurements.
     int64_t FramesRendered() const { return framesRendered.load(); }
+    // The shortest time from the start of one frame to the next, in microseconds: 15000, about
+    // 66 frames a second. Tests lengthen it.
+    void SetFramePeriod(bigtime_t period) { fFramePeriod = period; }
 
     // Where system index stands on the screen now, or (-1, -1) when it is not drawn there.
     BPoint ScreenPointOf(int32_t index);
@@ -243,6 +250,7 @@ private:
     std::mutex fSuspendLock; // with fSuspendChanged: where the main render thread pauses
     std::condition_variable fSuspendChanged;
     std::atomic<bool> fSuspended { false };
+    std::atomic<bigtime_t> fFramePeriod { 15000 }; // microseconds
     // A share of the last frame was still being drawn when its wait timed out; only whoever
     // draws frames touches it.
     bool fSharesMissing = false;

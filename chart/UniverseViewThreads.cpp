@@ -38,14 +38,22 @@ void UniverseView::DetachedFromWindow()
 {
     if (!mainRenderThread.joinable())
         return;
+    StopRendering();
+    mainRenderThread.join();
+}
+
+void UniverseView::StopRendering()
+{
+    if (!mainRenderThread.joinable())
+        return;
     Resume();
     {
-        // Under the pause lock, so a thread about to pause sees that it is to end instead.
+        // Under the pause lock, so a thread about to pause or to wait for its next frame sees
+        // that it is to end instead.
         std::lock_guard lock(fSuspendLock);
         running = 0;
     }
     fSuspendChanged.notify_all();
-    mainRenderThread.join();
 }
 
 void UniverseView::Resume()
@@ -231,11 +239,15 @@ void UniverseView::MainRenderLoop()
         UpdateData(selectedSystem.load(), targetSystem.load());
         renderLock->Release();
 
+        // At most one frame a period; the wait ends early when the loop is to end.
+        std::unique_lock lock(fSuspendLock);
         const bigtime_t dt = system_time() - t0;
-        if (dt < 15000)
-            snooze(15000 - dt);
+        const bigtime_t period = fFramePeriod.load(std::memory_order_relaxed);
+        if (dt < period) {
+            fSuspendChanged.wait_for(
+                lock, std::chrono::microseconds(period - dt), [&] { return !running; });
+        }
         if (suspendRequested) {
-            std::unique_lock lock(fSuspendLock);
             fSuspended = true;
             fSuspendChanged.wait(lock, [&] { return !suspendRequested || !running; });
             fSuspended = false;

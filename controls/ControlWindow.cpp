@@ -85,7 +85,13 @@ ControlWindow::ControlWindow(BPoint where, const char* title, QObject* applicati
 
 ControlWindow::~ControlWindow()
 {
-    // The charts go first: they draw the universe until their threads have stopped.
+    // The charts go first: they draw the universe until their threads have stopped. Every
+    // chart is told to stop before the first is waited for, so that the frames still being
+    // drawn finish side by side rather than one after another.
+    for (const QPointer<UniverseWindow>& window : universeWindows) {
+        if (window)
+            window->View()->StopRendering();
+    }
     for (const QPointer<UniverseWindow>& window : universeWindows)
         delete window.data();
     for (const QPointer<QWidget>& window : fOtherWindows)

@@ -139,6 +139,24 @@ TEST_F(UniverseViewTest, ClosingASuspendedChartEndsAllItsThreads)
     EXPECT_EQ(Count(ThreadNames(), "Render Thread"), 0);
 }
 
+TEST_F(UniverseViewTest, StoppingWakesTheLoopWaitingForItsNextFrame)
+{
+    Universe* u = MakeUniverse({ { "Sol", 0, 0, 0, 4.7 } });
+    UniverseView* view = MakeView(u, 2);
+    // A minute between frames: after its first frame the loop waits for the next one, far
+    // longer than the bounded wait below, unless the stop wakes it.
+    view->SetFramePeriod(60000000);
+    view->AttachedToWindow();
+    ASSERT_TRUE(WaitForFrames(view, 1));
+    auto stopped = std::async(std::launch::async, [&] { view->DetachedFromWindow(); });
+    const bool ended = stopped.wait_for(20s) == std::future_status::ready;
+    EXPECT_TRUE(ended) << "the frame loop slept through the stop";
+    stopped.wait();
+    EXPECT_EQ(view->FramesRendered(), 1);
+    EXPECT_EQ(Count(ThreadNames(), "Main Render Thr"), 0);
+    EXPECT_EQ(Count(ThreadNames(), "Render Thread"), 0);
+}
+
 TEST_F(UniverseViewTest, AResizeShowsOnlyAfterAFrameIsHandedOver)
 {
     Universe* u = MakeUniverse({ { "Sol", 0, 0, 0, 4.7 } });

@@ -137,3 +137,30 @@ TEST_F(ControlWindowTest, AMissingCatalogueStillOpensAnEmptyChart)
     UniverseView* view = ViewOf(controls.UniverseWindows()[0]);
     EXPECT_TRUE(QTest::qWaitFor([&] { return view->FramesRendered() >= 2; }, 5000));
 }
+
+TEST_F(ControlWindowTest, TheEndTellsEveryChartToStopBeforeWaitingForAny)
+{
+    auto* controls = new ControlWindow(BPoint(90, 60), "3D Nightdome");
+    for (int i = 0; i < 3; i++) {
+        Message open(kNewUniverseWindow);
+        controls->MessageReceived(&open);
+    }
+    ASSERT_EQ(controls->UniverseWindows().size(), 4);
+    QList<UniverseView*> views;
+    for (const QPointer<UniverseWindow>& window : controls->UniverseWindows()) {
+        UniverseView* view = ViewOf(window);
+        ASSERT_TRUE(QTest::qWaitFor([&] { return view->FramesRendered() >= 2; }, 5000));
+        views.append(view);
+    }
+    // When the first chart has waited for its render threads and goes, the other charts' loops
+    // have been told to end already: their last frames are drawn alongside, not in turn.
+    QList<bool> othersRunning;
+    QObject::connect(controls->UniverseWindows()[0], &QObject::destroyed, [&] {
+        for (qsizetype i = 1; i < views.size(); i++)
+            othersRunning.append(views[i]->IsRunning());
+    });
+    delete controls;
+    ASSERT_EQ(othersRunning.size(), 3);
+    for (bool running : othersRunning)
+        EXPECT_FALSE(running);
+}
