@@ -1,8 +1,10 @@
 // The application object: the spectral tables it builds and the end of the program.
+#include "ThreadNames.h"
 #include "app/ThreeDNightdomeApp.h"
 #include "chart/UniverseWindow.h"
 #include "controls/ControlWindow.h"
 #include "core/MessageCodes.h"
+#include "platform/qt/Messaging.h"
 #include "render/SpectralTables.h"
 
 #include <QIcon>
@@ -78,6 +80,39 @@ TEST(ThreeDNightdomeApp, ClosingTheControlsEndsTheProgramWithChartsOpen)
     const bool ended = RunsToItsEnd(application);
     EXPECT_TRUE(ended) << "the program did not end";
     delete application;
+}
+
+TEST(ThreeDNightdomeApp, QuittingWithWindowsOpenEndsEveryThreadItStarted)
+{
+    auto* application = NewApplication();
+    ControlWindow* controls = application->GetControlWindow();
+    bool opened = false;
+    QTimer::singleShot(100, controls, [&] {
+        // Three charts more, a star information window (its terminal thread) and a diagram.
+        for (const char* button : { "New Nightdome Button", "New Nightdome Button",
+                 "New Nightdome Button", "Show Info Window Button", "Show H-R Window Button" }) {
+            auto* widget = controls->findChild<QWidget*>(button);
+            if (!widget)
+                return;
+            QTest::mouseClick(widget, Qt::LeftButton, Qt::NoModifier, QPoint(16, 16));
+            DeliverPostedMessages(); // the button's command
+        }
+        opened = QTest::qWaitFor(
+            [&] {
+                const auto names = ThreadNames();
+                return Count(names, "Main Render Thr") == 4 && Count(names, "Terminal Thread") == 1;
+            },
+            5000);
+        controls->close();
+    });
+    const bool ended = RunsToItsEnd(application);
+    EXPECT_TRUE(opened) << "the windows did not open, or their threads did not start";
+    EXPECT_TRUE(ended) << "the program did not end";
+    delete application;
+    const auto names = ThreadNames();
+    EXPECT_EQ(Count(names, "Main Render Thr"), 0);
+    EXPECT_EQ(Count(names, "Render Thread"), 0);
+    EXPECT_EQ(Count(names, "Terminal Thread"), 0);
 }
 
 TEST(ThreeDNightdomeApp, ClosingTheOnlyChartLeavesTheProgramRunning)

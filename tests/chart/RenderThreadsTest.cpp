@@ -1,39 +1,16 @@
 // The frame loop on its threads: workers, pausing, resizing and stopping.
 #include "ChartFixture.h"
+#include "ThreadNames.h"
 
 #include <QTest>
 #include <algorithm>
 #include <chrono>
-#include <dirent.h>
-#include <fstream>
 #include <future>
 #include <thread>
 
 using namespace std::chrono_literals;
 
 namespace {
-
-// The names of this process's threads, as the kernel keeps them.
-std::vector<std::string> ThreadNames()
-{
-    std::vector<std::string> names;
-    DIR* tasks = opendir("/proc/self/task");
-    while (dirent* entry = readdir(tasks)) {
-        if (entry->d_name[0] == '.')
-            continue;
-        std::ifstream comm(std::string("/proc/self/task/") + entry->d_name + "/comm");
-        std::string name;
-        std::getline(comm, name);
-        names.push_back(name);
-    }
-    closedir(tasks);
-    return names;
-}
-
-int Count(const std::vector<std::string>& names, const std::string& name)
-{
-    return int(std::count(names.begin(), names.end(), name));
-}
 
 bool WaitForFrames(UniverseView* view, int64_t frames)
 {
