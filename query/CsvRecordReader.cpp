@@ -45,7 +45,7 @@ bool CsvRecordReader::Next(std::vector<std::string>& fields)
     const size_t size = fText.size();
     for (;;) {
         if (fields.size() == kMaxFields)
-            return Fail(fLine, "more than " + std::to_string(kMaxFields) + " fields in one row");
+            return Fail(fLine, "over " + std::to_string(kMaxFields) + " fields in a row");
         std::string& field = fields.emplace_back();
         if (fPos < size && fText[fPos] == '"') {
             const int64_t opened = fLine;
@@ -71,7 +71,7 @@ bool CsvRecordReader::Next(std::vector<std::string>& fields)
                     return Fail(opened, "a field longer than 64 KiB");
             }
             if (fPos < size && fText[fPos] != ',' && fText[fPos] != '\r' && fText[fPos] != '\n')
-                return Fail(fLine, "text after the closing quote of a quoted field");
+                return Fail(fLine, "text after a closing quote");
         } else {
             const size_t begin = fPos;
             while (fPos < size && fText[fPos] != ',' && fText[fPos] != '\r' && fText[fPos] != '\n')

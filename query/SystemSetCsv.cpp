@@ -194,8 +194,7 @@ SystemSetCsvResult SystemSetCsv::Read(
     }
     const Columns columns = FindColumns(row);
     if (!columns.Usable()) {
-        result.error = "line " + std::to_string(reader.Line())
-            + ": the header names neither a Name column nor x, y and z columns";
+        result.error = "line " + std::to_string(reader.Line()) + ": no Name or x, y, z column";
         return result;
     }
     while (reader.Next(row)) {
