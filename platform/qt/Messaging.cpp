@@ -99,13 +99,20 @@ bool PostMessageToView(QWidget* window, const char* viewName, const Message& mes
     return PostMessage(window->findChild<QWidget*>(viewName), message);
 }
 
+// Rounds of Qt's posted events and the mailbox's work: enough for any chain of hand-overs
+// between the two, few enough to end while charts keep handing over frames.
+constexpr int kDeliveryRounds = 8;
+
 void DeliverPostedMessages()
 {
     // Everything posted, in order: a dispatcher whose installation was queued from another
     // thread must be in place before the messages behind it. Work from the mailbox may post in
     // turn, and the other way round.
     ThreadMailbox& mailbox = ThreadMailbox::Instance();
-    do
+    for (int round = 0; round < kDeliveryRounds; round++) {
         QCoreApplication::sendPostedEvents();
-    while (mailbox.Deliver() > 0);
+        if (mailbox.Deliver() == 0)
+            return;
+    }
+    QCoreApplication::sendPostedEvents();
 }

@@ -44,4 +44,6 @@ bool PostMessageToView(QWidget* window, const char* viewName, const Message& mes
 
 // Delivers what is posted to this thread's objects, messages included, until nothing is
 // pending: for tests and for code that must see its posted messages handled before it goes on.
+// While charts run, their frames keep coming; it then stops after a bounded number of rounds,
+// each of which delivers everything that was waiting when it began.
 void DeliverPostedMessages();

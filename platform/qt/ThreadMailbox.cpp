@@ -53,6 +53,7 @@ void ThreadMailbox::Post(std::function<void()> work)
         std::lock_guard lock(fLock);
         wasEmpty = fQueue.empty();
         fQueue.push_back(std::move(work));
+        fChained = fChained || OnApplicationThread();
     }
     // One wake-up for a run of posts: the application's thread takes the whole queue at once.
     if (wasEmpty)
@@ -71,11 +72,12 @@ int ThreadMailbox::Deliver()
     uint64_t count;
     [[maybe_unused]] const ssize_t read = ::read(fWake, &count, sizeof count);
     int ran = 0;
-    for (;;) {
+    for (int round = 0; round < kRounds; round++) {
         std::deque<std::function<void()>> batch;
         {
             std::lock_guard lock(fLock);
             batch.swap(fQueue);
+            fChained = false;
         }
         if (batch.empty())
             return ran;
@@ -83,5 +85,10 @@ int ThreadMailbox::Deliver()
             work();
             ran++;
         }
+        std::lock_guard lock(fLock);
+        if (!fChained)
+            break;
     }
+    // Whatever is still queued was posted after the batch was taken; its poster woke the loop.
+    return ran;
 }

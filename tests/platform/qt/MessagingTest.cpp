@@ -1,10 +1,15 @@
 #include "platform/qt/RecordingHandler.h"
 
 #include "core/MessageCodes.h"
+#include "platform/qt/ThreadMailbox.h"
 
 #include <QApplication>
 #include <QPointer>
+#include <atomic>
+#include <chrono>
+#include <functional>
 #include <gtest/gtest.h>
+#include <memory>
 #include <thread>
 
 TEST(Messaging, PostedMessagesArriveLaterThroughTheEventLoop)
@@ -93,4 +98,44 @@ TEST(Messaging, MessagesPostedFromOtherThreadsArriveOnTheHandlersThread)
     DeliverPostedMessages();
     ASSERT_EQ(handler.received.size(), 3u);
     EXPECT_EQ(handler.received[2].FindInt32(kSystemIndexString), 2);
+}
+
+// A chart hands its next frame to the application's thread as soon as the last one was taken,
+// for as long as it runs. Delivering what is posted must end while such a thread goes on, and
+// must still run every chain of work that the work itself posts on the application's thread.
+TEST(Messaging, DeliveringEndsWhileAnotherThreadKeepsHandingOverWork)
+{
+    ThreadMailbox& mailbox = ThreadMailbox::Instance();
+    std::atomic<bool> stop { false };
+    std::atomic<int> posted { 0 };
+    constexpr int kGiveUp = 3000; // hand-overs before the poster stops by itself
+    std::thread poster([&] {
+        while (!stop.load() && posted.load() < kGiveUp) {
+            auto taken = std::make_shared<std::atomic<bool>>(false);
+            mailbox.Post([taken] {
+                taken->store(true);
+                // Showing a frame takes a while; the next one is handed over meanwhile.
+                std::this_thread::sleep_for(std::chrono::milliseconds(1));
+            });
+            posted++;
+            while (!taken->load() && !stop.load())
+                std::this_thread::yield();
+        }
+    });
+    while (posted.load() == 0)
+        std::this_thread::yield();
+
+    int chain = 0;
+    std::function<void()> link = [&] {
+        if (++chain < 5)
+            mailbox.Post(link);
+    };
+    mailbox.Post(link);
+    DeliverPostedMessages();
+    const bool posterStillRunning = posted.load() < kGiveUp;
+    stop = true;
+    poster.join();
+    DeliverPostedMessages();
+    EXPECT_TRUE(posterStillRunning) << "delivering went on until the poster gave up";
+    EXPECT_EQ(chain, 5);
 }
