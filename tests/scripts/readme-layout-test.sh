@@ -39,11 +39,13 @@ for path in "$root"/*/; do
     else
         case "$folder" in build | build-*) continue ;; esac
     fi
-    printf '%s\n' "$named" | grep -qx "$folder" || fail "the table has no line for $folder/"
+    # A here-string, not a pipe: grep -q stops reading at its match, and the writer of a pipe
+    # could then die of SIGPIPE, which pipefail would count as no match.
+    grep -qx "$folder" <<< "$named" || fail "the table has no line for $folder/"
 done
 
 while IFS= read -r row; do
-    if printf '%s\n' "$row" | grep -qiE '\blater\b|to come'; then
+    if grep -qiE '\blater\b|to come' <<< "$row"; then
         fail "a line says what is to come, not what is there: $row"
     fi
 done <<< "$rows"
