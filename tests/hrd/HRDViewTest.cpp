@@ -1,5 +1,6 @@
 // The H-R diagram view: its scales, plotting systems that arrive in every way, the full plot
 // list, clearing, naming the marker under the mouse and dragging systems out.
+#include "ViewMessages.h"
 #include "query/UniverseBuilder.h"
 
 #include "core/MessageCodes.h"
@@ -37,12 +38,7 @@ protected:
         view->SetDragStarter(CatchDrag(caught));
     }
 
-    void SendUniverse(Universe* sky = nullptr)
-    {
-        Message message(kUniversePointer);
-        message.AddPointer(kUniversePtrString, sky ? sky : &universe);
-        view->MessageReceived(&message);
-    }
+    void SendUniverse(Universe* sky = nullptr) { HandUniverse(*view, sky ? sky : &universe); }
 
     void Send(uint32_t what, const char* field, int32_t index)
     {
@@ -497,12 +493,8 @@ TEST_F(HRDViewTest, AClickOrADragLetGoOverTheDiagramItselfPlotsNothingMore)
 
     // Another diagram's drag let go here is plotted.
     HRDView other(BPoint(0, 0), "Other");
-    Message universeMessage(kUniversePointer);
-    universeMessage.AddPointer(kUniversePtrString, &universe);
-    other.MessageReceived(&universeMessage);
-    Message star(kStarMessage);
-    star.AddInt32(kSystemIndexString, vega);
-    other.MessageReceived(&star);
+    HandUniverse(other, &universe);
+    HandSystem(other, vega);
     other.SetDragStarter(LetGoOver(view.get(), QPoint(150, 150), taken));
     PressMouse(&other, MarkerOf(vega));
     EXPECT_TRUE(taken);

@@ -2,6 +2,7 @@
 // message and by drop, what is typed where, what is retyped when, dragging systems out and the
 // help line for the half under the mouse.
 #include "CommaLocale.h"
+#include "ViewMessages.h"
 #include "info/StarInfoScreen.h"
 #include "query/UniverseBuilder.h"
 
@@ -92,20 +93,10 @@ protected:
         view->SetDragStarter(CatchDrag(caught));
     }
 
-    void SendUniverse()
-    {
-        Message message(kUniversePointer);
-        message.AddPointer(kUniversePtrString, &universe);
-        view->MessageReceived(&message);
-    }
+    void SendUniverse() { HandUniverse(*view, &universe); }
 
     // A 'StaR' that was not dropped.
-    void Send(int32_t index)
-    {
-        Message message(kStarMessage);
-        message.AddInt32(kSystemIndexString, index);
-        view->MessageReceived(&message);
-    }
+    void Send(int32_t index) { HandSystem(*view, index); }
 
     // A 'StaR' let go at where (view coordinates).
     void Drop(int32_t index, QPoint where)
@@ -694,12 +685,8 @@ TEST_F(StarIViewTest, ASystemDraggedOutAndLetGoOverTheViewItselfChangesNothing)
 
     // Another view's system let go over the lower half goes there.
     StarIView other(BPoint(0, 0), "Other View");
-    Message universeMessage(kUniversePointer);
-    universeMessage.AddPointer(kUniversePtrString, &universe);
-    other.MessageReceived(&universeMessage);
-    Message star(kStarMessage);
-    star.AddInt32(kSystemIndexString, near);
-    other.MessageReceived(&star);
+    HandUniverse(other, &universe);
+    HandSystem(other, near);
     other.SetDragStarter(LetGoOver(view.get(), QPoint(100, 150), taken));
     PressMouse(&other, QPoint(100, 30));
     EXPECT_TRUE(taken);
