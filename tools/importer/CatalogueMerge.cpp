@@ -136,7 +136,11 @@ void AddStars(std::vector<ImportStar>& stars, std::vector<ImportStar> extra, Mer
         report.matched++;
         report.typesChanged += stars[s].spectralClass != extra[e].spectralClass;
         report.namesChanged += stars[s].name != extra[e].name;
+        // The star replaced keeps being findable by every name it had.
+        ImportStar replaced = std::move(stars[s]);
         stars[s] = extra[e];
+        AddAlias(stars[s], replaced.name);
+        AddAliases(stars[s], replaced.aliases);
         matched[e] = true;
     }
     for (size_t e = 0; e < extra.size(); e++) {
@@ -159,8 +163,10 @@ void AnnotateStars(
             star.classEstimated = false;
             report.typesChanged++;
         }
+        AddAliases(star, label.aliases);
         if (label.nameKind <= star.nameKind) {
             report.namesChanged += star.name != label.name;
+            AddAlias(star, star.name);
             star.name = label.name;
             star.nameKind = label.nameKind;
             // The table's letter for the star goes with the name the table gave it.
@@ -212,6 +218,7 @@ int64_t LetterSharedNames(std::vector<ImportStar>& stars)
             continue;
         for (size_t k = 0; k < members.size(); k++) {
             taken.insert(names[k]);
+            AddAlias(stars[members[k]], stars[members[k]].name);
             stars[members[k]].name = std::move(names[k]);
             lettered++;
         }

@@ -77,6 +77,49 @@ WriteSummary FormatCatalogue(
     return summary;
 }
 
+std::string NamesFileOf(const std::string& catalogue)
+{
+    const std::filesystem::path path(catalogue);
+    if (!path.has_extension() || path.filename() == path.extension())
+        return catalogue + ".names";
+    std::filesystem::path names = path;
+    names.replace_extension(".names");
+    return names.string();
+}
+
+void FormatNames(std::FILE* out, const std::vector<ImportStar>& stars,
+    const std::vector<StarGroup>& systems, int64_t catalogueBytes, WriteSummary& summary)
+{
+    int64_t count = 1; // the Sun
+    for (const StarGroup& system : systems)
+        count += static_cast<int64_t>(system.members.size());
+    std::fprintf(out, "nightdome names 1\n%lld %lld\n", static_cast<long long>(count),
+        static_cast<long long>(catalogueBytes));
+    int64_t index = 1;
+    std::vector<std::string> written;
+    for (const StarGroup& system : systems) {
+        for (size_t member : system.members) {
+            const ImportStar& star = stars[member];
+            written.assign(1, CleanName(star.name));
+            ForEachAlias(star.aliases, [&](const std::string& alias) {
+                std::string clean = CleanName(alias);
+                if (!clean.empty()
+                    && std::find(written.begin(), written.end(), clean) == written.end())
+                    written.push_back(std::move(clean));
+            });
+            if (written.size() > 1) {
+                std::fprintf(out, "%lld", static_cast<long long>(index));
+                for (size_t i = 1; i < written.size(); i++)
+                    std::fprintf(out, "\t%s", written[i].c_str());
+                std::fputc('\n', out);
+                summary.starsWithOtherNames++;
+                summary.otherNames += static_cast<int64_t>(written.size() - 1);
+            }
+            index++;
+        }
+    }
+}
+
 namespace {
 
 namespace fs = std::filesystem;
@@ -356,9 +399,27 @@ WriteSummary WriteCatalogue(const std::string& path, const std::vector<ImportSta
     const mode_t mode = stat(target.c_str(), &old) == 0 ? old.st_mode & 07777 : 0644;
     const int64_t leftovers = RemoveLeftovers(target);
 
-    TemporaryCatalogue temporary(target, path);
-    WriteSummary summary = FormatCatalogue(temporary.File(), stars, systems);
-    temporary.Replace(mode);
+    WriteSummary summary;
+    int64_t bytes = 0;
+    {
+        TemporaryCatalogue temporary(target, path);
+        summary = FormatCatalogue(temporary.File(), stars, systems);
+        if (std::fflush(temporary.File()) != 0 || (bytes = std::ftell(temporary.File())) < 0)
+            throw ImportError(path, 0, Reason("cannot write", errno));
+        temporary.Replace(mode);
+    }
     summary.leftoversRemoved = leftovers;
+
+    // The other names, written after the catalogue they go with: a run killed in between
+    // leaves a names file whose size no longer matches, which the program passes over.
+    summary.namesFile = NamesFileOf(path);
+    const std::string namesTarget = CatalogueTarget(summary.namesFile);
+    struct stat oldNames;
+    const mode_t namesMode
+        = stat(namesTarget.c_str(), &oldNames) == 0 ? oldNames.st_mode & 07777 : mode;
+    summary.leftoversRemoved += RemoveLeftovers(namesTarget);
+    TemporaryCatalogue names(namesTarget, summary.namesFile);
+    FormatNames(names.File(), stars, systems, bytes, summary);
+    names.Replace(namesMode);
     return summary;
 }

@@ -14,7 +14,23 @@ struct WriteSummary {
     int64_t stars = 0; // the Sun included
     std::vector<int64_t> systemsBySize; // [n] = systems of n stars
     int64_t leftoversRemoved = 0; // temporary files of killed imports found beside it
+    std::string namesFile; // where the stars' other names went
+    int64_t starsWithOtherNames = 0;
+    int64_t otherNames = 0;
 };
+
+// The file of other names that goes with a catalogue: its name with the extension replaced by
+// ".names" ("stars.dat" -> "stars.names"), or ".names" appended to a name without one.
+std::string NamesFileOf(const std::string& catalogue);
+
+// Writes the stars' other names (ImportStar::aliases, less each star's own name) in the order
+// FormatCatalogue writes the stars, for a catalogue of catalogueBytes bytes:
+//   "nightdome names 1"
+//   "<stars in the catalogue> <catalogueBytes>"
+//   "<star index>\t<name>\t<name>..." for each star with other names, the Sun being star 0.
+// Counts what it wrote into summary.
+void FormatNames(std::FILE* out, const std::vector<ImportStar>& stars,
+    const std::vector<StarGroup>& systems, int64_t catalogueBytes, WriteSummary& summary);
 
 // Writes the catalogue's text to out: "The Sun" first, then every system with its stars at the
 // position of its primary. Every record reads back to the same star: names and classes are
@@ -34,6 +50,7 @@ std::string CatalogueTarget(const std::string& path);
 // replaces it only when all is written and takes over its permissions (0644 for a new file), so
 // a failed run never leaves a partial catalogue. SIGINT, SIGTERM and SIGHUP remove the
 // temporary file before the process dies of them; the unlocked leftovers of killed imports
-// beside the file are removed first. Throws ImportError when it cannot write.
+// beside the file are removed first. Then the other names go to NamesFileOf(path) the same
+// way. Throws ImportError when it cannot write.
 WriteSummary WriteCatalogue(const std::string& path, const std::vector<ImportStar>& stars,
     const std::vector<StarGroup>& systems);

@@ -40,6 +40,38 @@ constexpr std::pair<const char*, const char*> kGreek[] = {
     { "pi", "Pi" },
 };
 
+// The short spellings of the Greek letters: the astronomical databases' first, then the older
+// one where it differs.
+constexpr std::pair<const char*, const char*> kShortGreek[] = {
+    { "Alpha", "alf" },
+    { "Alpha", "alp" },
+    { "Beta", "bet" },
+    { "Gamma", "gam" },
+    { "Delta", "del" },
+    { "Epsilon", "eps" },
+    { "Zeta", "zet" },
+    { "Eta", "eta" },
+    { "Theta", "tet" },
+    { "Theta", "the" },
+    { "Iota", "iot" },
+    { "Kappa", "kap" },
+    { "Lambda", "lam" },
+    { "Mu", "mu" },
+    { "Nu", "nu" },
+    { "Xi", "ksi" },
+    { "Xi", "xi" },
+    { "Omicron", "omi" },
+    { "Pi", "pi" },
+    { "Rho", "rho" },
+    { "Sigma", "sig" },
+    { "Tau", "tau" },
+    { "Upsilon", "ups" },
+    { "Phi", "phi" },
+    { "Chi", "chi" },
+    { "Psi", "psi" },
+    { "Omega", "ome" },
+};
+
 constexpr std::pair<const char*, const char*> kConstellations[] = {
     { "And", "Andromedae" },
     { "Ant", "Antliae" },
@@ -358,4 +390,35 @@ std::string WrittenOutDesignation(const std::string& id)
             return greek.second + number + " " + genitive + component;
     }
     return {};
+}
+
+std::vector<std::string> DesignationForms(const std::string& id)
+{
+    const std::string written = WrittenOutDesignation(id);
+    if (written.empty())
+        return {};
+    std::vector<std::string> forms { written };
+    const std::vector<std::string> words = Words(id);
+    const std::string genitive = ConstellationGenitive(words[1]);
+    std::string abbreviation;
+    for (const auto& [abbr, name] : kConstellations) {
+        if (genitive == name)
+            abbreviation = abbr;
+    }
+    const std::string tail = " " + abbreviation + (words.size() == 3 ? " " + words[2] : "");
+    // The written-out form's first word: the Greek letter and its number, a Latin letter or a
+    // Flamsteed number.
+    const std::string first = written.substr(0, written.find(' '));
+    size_t letters = 0;
+    while (letters < first.size() && IsAlpha(first[letters]))
+        letters++;
+    if (letters <= 1) {
+        forms.push_back(first + tail);
+        return forms;
+    }
+    for (const auto& [letter, spelling] : kShortGreek) {
+        if (first.compare(0, letters, letter) == 0 && std::strlen(letter) == letters)
+            forms.push_back(spelling + first.substr(letters) + tail);
+    }
+    return forms;
 }

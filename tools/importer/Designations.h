@@ -22,6 +22,12 @@ std::vector<std::string> Words(const std::string& text);
 // Majoris Bb". Empty for anything else, such as variable-star names ("V645 Cen", "BL Cet").
 std::string WrittenOutDesignation(const std::string& id);
 
+// Every way a Bayer or Flamsteed designation is commonly written, written out first: "alpha1
+// Cen" -> "Alpha1 Centauri", "alf1 Cen", "alp1 Cen"; "61 Cyg B" -> "61 Cygni B", "61 Cyg B".
+// The short forms use the three-letter Greek abbreviations of the astronomical databases (and
+// the older "alp", "the", "xi" where they differ). Empty for anything else.
+std::vector<std::string> DesignationForms(const std::string& id);
+
 // The genitive of a constellation's three-letter abbreviation ("Cyg" -> "Cygni"); empty when
 // unknown. Case matters only where it tells two constellations apart.
 std::string ConstellationGenitive(const std::string& abbreviation);

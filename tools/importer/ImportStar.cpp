@@ -25,3 +25,22 @@ ImportError::ImportError(const std::string& file, int64_t line, const std::strin
     , reason(reason)
 {
 }
+
+void AddAlias(ImportStar& star, const std::string& name)
+{
+    if (name.empty() || name.find('\t') != std::string::npos)
+        return;
+    const std::string entry = name + '\t';
+    // Whole entries only: "HD 1" must not be taken for the end of "HD 11".
+    for (size_t at = star.aliases.find(entry); at != std::string::npos;
+         at = star.aliases.find(entry, at + 1)) {
+        if (at == 0 || star.aliases[at - 1] == '\t')
+            return;
+    }
+    star.aliases += entry;
+}
+
+void AddAliases(ImportStar& star, const std::string& names)
+{
+    ForEachAlias(names, [&](const std::string& name) { AddAlias(star, name); });
+}

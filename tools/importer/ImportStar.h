@@ -36,7 +36,22 @@ struct ImportStar {
     // The star's own letter in its multiple system as its source publishes it ('A' to 'Z'), 0
     // when it gives none; a name the star shares with its companions takes this letter.
     char component = 0;
+    // The star's other names ("HD 48915", "alf CMa", "Gaia DR3 ..."), each ended by a tab;
+    // the shown name may be among them and is left out when they are written.
+    std::string aliases;
 };
+
+// Adds name to the star's other names unless it is empty or already there.
+void AddAlias(ImportStar& star, const std::string& name);
+// Adds every name of a tab-ended list (ImportStar::aliases) to the star's other names.
+void AddAliases(ImportStar& star, const std::string& names);
+// Calls f with each name of a tab-ended list (ImportStar::aliases).
+template <typename F> void ForEachAlias(const std::string& names, F f)
+{
+    size_t begin = 0;
+    for (size_t tab; (tab = names.find('\t', begin)) != std::string::npos; begin = tab + 1)
+        f(names.substr(begin, tab - begin));
+}
 
 // What the importer did with its input: stars read, and the ones left out, by reason.
 struct ImportReport {

@@ -1,12 +1,14 @@
 // The import pipeline and its report.
 #include "tools/importer/Importer.h"
 
+#include "tools/importer/GaiaCatalogue.h"
 #include "tools/importer/SourceReaders.h"
 
 #include <algorithm>
 #include <cctype>
 #include <cerrno>
 #include <cstring>
+#include <filesystem>
 #include <fstream>
 #include <new>
 #include <sstream>
@@ -60,6 +62,8 @@ const char* FormatName(InputFormat format)
         return "plain CSV";
     case InputFormat::SouthernStars:
         return "Southern Stars CSV";
+    case InputFormat::Gaia:
+        return "Gaia DR3 and Hipparcos, binary";
     case InputFormat::Guess:
         break;
     }
@@ -128,16 +132,55 @@ private:
     char fBuffer[1 << 16];
 };
 
+void CheckSomethingRead(
+    const std::string& file, const std::vector<ImportStar>& stars, const ImportReport& report);
+
+// Whether the folder holds the star files of the binary catalogue.
+bool IsGaiaFolder(const std::string& folder)
+{
+    std::error_code error;
+    for (std::filesystem::directory_iterator entry(folder, error), end; !error && entry != end;
+         entry.increment(error)) {
+        const std::string name = entry->path().filename().string();
+        if (name.rfind("stars_", 0) == 0 && name.size() > 8 && name[6] >= '0' && name[6] <= '9'
+            && name[7] == '_')
+            return true;
+    }
+    return false;
+}
+
 // Reads the stars of file, refusing a file that is no catalogue at all.
 void ReadInput(const std::string& file, InputFormat givenFormat, std::vector<ImportStar>& stars,
     ImportReport& report)
 {
-    struct stat st;
-    if (stat(file.c_str(), &st) == 0 && S_ISDIR(st.st_mode))
+    struct stat st { };
+    const bool found = stat(file.c_str(), &st) == 0;
+    const bool folder = found && S_ISDIR(st.st_mode);
+    if (folder
+        && !(givenFormat == InputFormat::Gaia
+            || (givenFormat == InputFormat::Guess && IsGaiaFolder(file))))
         throw ImportError(file, 0, "is a directory, not a catalogue");
-    std::ifstream in(file, std::ios::binary);
-    if (!in)
-        throw ImportError(file, 0, std::string("cannot open: ") + std::strerror(errno));
+    std::ifstream in;
+    if (!folder) {
+        in.open(file, std::ios::binary);
+        if (!in)
+            throw ImportError(file, 0, std::string("cannot open: ") + std::strerror(errno));
+    }
+    // The binary catalogue: a folder of its files, or one regular file that starts with its
+    // magic (looked at through a stream of its own: a pipe cannot go back to its start).
+    if (!folder && givenFormat == InputFormat::Guess && found && S_ISREG(st.st_mode)) {
+        std::ifstream peek(file, std::ios::binary);
+        char magic[4] = {};
+        peek.read(magic, sizeof magic);
+        if (IsGaiaStarFile(std::string_view(magic, static_cast<size_t>(peek.gcount()))))
+            givenFormat = InputFormat::Gaia;
+    }
+    if (folder || givenFormat == InputFormat::Gaia) {
+        report.format = FormatName(InputFormat::Gaia);
+        ReadGaiaCatalogue(file, stars, report);
+        CheckSomethingRead(file, stars, report);
+        return;
+    }
     std::string first;
     if (!std::getline(in, first) || (first.empty() && in.peek() == EOF))
         throw ImportError(file, 0, "the file is empty");
@@ -166,9 +209,16 @@ void ReadInput(const std::string& file, InputFormat givenFormat, std::vector<Imp
     case InputFormat::SouthernStars:
         ReadSouthernStars(whole, file, stars, report);
         break;
+    case InputFormat::Gaia:
     case InputFormat::Guess:
         break;
     }
+    CheckSomethingRead(file, stars, report);
+}
+
+void CheckSomethingRead(
+    const std::string& file, const std::vector<ImportStar>& stars, const ImportReport& report)
+{
     if (report.read == 0)
         throw ImportError(file, 0, "no stars in the file");
     if (stars.empty()) {

@@ -10,7 +10,7 @@
 #include <string>
 #include <vector>
 
-enum class InputFormat { Guess, KStars, Hyg, Csv, SouthernStars };
+enum class InputFormat { Guess, KStars, Hyg, Csv, SouthernStars, Gaia };
 
 struct ImportOptions {
     InputFormat format = InputFormat::Guess;

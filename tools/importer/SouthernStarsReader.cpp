@@ -104,6 +104,20 @@ void NameFromIds(ImportStar& star, const std::string& names, const std::string& 
         { { proper, NameKind::Proper }, { bayer, NameKind::Designation },
             { flamsteed, NameKind::Designation }, { gliese, NameKind::Gliese },
             { hd, NameKind::HenryDraper } });
+
+    // Every name and identifier stays findable: designations in each common spelling, Gaia's
+    // source ids as the astronomical databases write them.
+    for (const std::string& name : Split(names, ';'))
+        AddAlias(star, CleanName(name));
+    for (const std::string& id : identifiers) {
+        const std::vector<std::string> forms = DesignationForms(id);
+        for (const std::string& form : forms)
+            AddAlias(star, form);
+        if (forms.empty() && id.rfind("GAIA ", 0) == 0)
+            AddAlias(star, "Gaia DR3 " + CleanName(id.substr(5)));
+        else if (forms.empty())
+            AddAlias(star, CleanName(id));
+    }
 }
 
 // The star's own component letter, 0 when the row gives none. Comp names the pair the

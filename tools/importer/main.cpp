@@ -69,8 +69,10 @@ int main(int argc, char** argv)
                 options.format = InputFormat::Csv;
             else if (value == "southern")
                 options.format = InputFormat::SouthernStars;
+            else if (value == "gaia")
+                options.format = InputFormat::Gaia;
             else
-                return Usage("unknown format '" + value + "' (kstars, hyg, csv or southern)");
+                return Usage("unknown format '" + value + "' (kstars, hyg, csv, southern or gaia)");
         } else if (Value(arg, "--add", &value)) {
             if (value.empty())
                 return Usage("--add needs a file name");
