@@ -390,6 +390,9 @@ std::string DescribeImport(const ImportResult& result)
             out << "  " << Thousands(s.systemsBySize[size]) << " of " << size
                 << (size == 1 ? " star\n" : " stars\n");
     }
+    if (!s.namesFile.empty())
+        out << "Other names: " << Thousands(s.otherNames) << " for "
+            << Thousands(s.starsWithOtherNames) << " stars, written to " << s.namesFile << ".\n";
     if (s.leftoversRemoved > 0)
         out << "Removed " << Thousands(s.leftoversRemoved)
             << (s.leftoversRemoved == 1 ? " temporary file" : " temporary files")
@@ -414,8 +417,9 @@ Options:
                       input catalogue itself, which an import must not overwrite.
                       Ctrl-C, SIGTERM and SIGHUP remove the temporary file; the one a
                       killed import leaves is removed by the next import into the folder.
-  --format=FORMAT     kstars, hyg, csv or southern; without it the first line decides.
-                      INPUT may be a pipe, such as /dev/stdin.
+  --format=FORMAT     kstars, hyg, csv, southern or gaia; without it the first line
+                      decides, or for gaia the file's header or a folder of its files.
+                      INPUT may be a pipe, such as /dev/stdin (not for gaia).
   --add=FILE          every star of FILE joins the sky with FILE's position, distance,
                       magnitude, spectral type and name; a star of INPUT that matches one
                       (see Matching) is replaced by it, so the star appears once. For a
@@ -446,6 +450,22 @@ Input formats:
   csv     Any CSV with a header row naming its columns: name, ra and dec in degrees,
           parallax in milliarcseconds or distance in parsecs, mag (apparent V) or absmag,
           and optionally spect and bv. Suits extracts from Gaia and other surveys.
+  gaia    The star catalogue of Gaia DR3 and Hipparcos in Debian's stellarium-data
+          package (usr/share/stellarium/stars/hip_gaia3/; Gaia data: ESA/Gaia/DPAC,
+          CC BY-SA 3.0 IGO). INPUT is the folder holding its star files
+          stars_<digit>_*.cat (all are read) or one of them; the files beside them are
+          read when they are there: stars_hip_sp_*.cat (spectral types),
+          common_star_names.fab (IAU names), name.fab (Bayer and Flamsteed
+          designations), cross-id.cat (HD and HR numbers). A binary file: a 28-byte
+          header (magic 0x835F040A, version, zone level, epoch), a star count per zone,
+          then 48-byte records (Gaia source id, direction and proper motion, B-V and V,
+          parallax and its error, spectral type, Hipparcos number). Stars whose parallax
+          is under five times its error are skipped and counted. Positions are carried
+          back from the catalogue's epoch (J2016.0) to J2000 along the proper motion.
+          The name is the IAU name, else the Bayer designation, else Bayer's Latin
+          letter, else the Flamsteed number, written out; else the HD number, else the
+          Hipparcos number, else the Gaia designation ("Gaia DR3 2509780430229120256").
+          A file that does not fit the format is refused with the byte offset and why.
   southern
           The star tables of Southern Stars Group, free for any use with credit:
           "Star data: Southern Stars Group, SSCore, SSData/Stars". Nearest.csv holds every
@@ -481,6 +501,13 @@ What is written:
   main-sequence star of the star's B-V ("DZ" with B-V 0.55: "DZ:F9"); temperatures and
   colours become classes by the dwarf sequence of Pecaut & Mamajek (2013). With neither,
   the type stays as it is and the star has no class.
+  Other names: every other name the inputs give a star (IAU, Bayer and Flamsteed in
+  full and short, "Alpha Centauri", "alf Cen"; HIP, HD, HR, GJ, Gaia DR3 and the
+  like), and the names of stars --add replaced or --annotate renamed, go to a file
+  beside the catalogue with the extension .names ("stars.dat" -> "stars.names"):
+  "nightdome names 1", then the catalogue's star count and size in bytes, then a
+  line per star with other names: its place in the catalogue (the Sun is 0) and
+  its names, separated by tabs. Nightdome's name queries search them too.
   Stars without a positive parallax are skipped and counted.
   An input with no star left to write is an error that says why its stars were skipped.
   Out of range is bad input: declination beyond +-90 degrees, right ascension outside
@@ -501,6 +528,9 @@ Matching (--add, --annotate):
   first ("61 Cygni A", "61 Cygni B"), passing over a letter another star already carries.
 
 The default sky of the build:
+  nightdome-import --format=gaia ~/.cache/nightdome/gaia \
+      --annotate=data/southern-stars/Brightest.csv --add=data/southern-stars/Nearest.csv
+  or, where the Gaia catalogue cannot be had, the Hipparcos catalogue of kstars-data:
   nightdome-import --format=kstars /usr/share/kstars/stars.dat \
       --annotate=data/southern-stars/Brightest.csv --add=data/southern-stars/Nearest.csv
 
