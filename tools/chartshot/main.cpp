@@ -1,5 +1,7 @@
 // nightdome-chartshot: renders one frame of a catalogue as the chart draws it and writes it to a
 // PNG, without a window. For screenshots, documentation and looking at what a change did.
+#include "catalog/Star.h"
+#include "catalog/StarSystem.h"
 #include "catalog/Universe.h"
 #include "chart/UniverseView.h"
 #include "platform/qt/BitmapImage.h"
@@ -22,6 +24,9 @@ Options:
   --size=WxH        the chart's size in pixels (default 640x480)
   --distance=PC     the camera's distance from the origin in parsecs (default 25)
   --turn=RADIANS    turn the chart about the vertical axis first (default 0)
+  --pitch=RADIANS   then tilt it about the screen's horizontal axis (default 0)
+  --origin=NAME     make the system of the star named NAME the origin, as a click on
+                    it in the chart does (default: the Sun)
   --threads=N       render threads (default 1)
   --frames=N        frames to advance before the picture (default 1)
 )";
@@ -44,8 +49,8 @@ int main(int argc, char** argv)
     QApplication application(argc, argv);
 
     int width = 640, height = 480, threads = 1, frames = 1;
-    double distance = 25, turn = 0;
-    std::string catalogue, output, value;
+    double distance = 25, turn = 0, tilt = 0;
+    std::string catalogue, output, value, origin;
     for (int i = 1; i < argc; i++) {
         if (Value(argv[i], "--size", &value)) {
             if (std::sscanf(value.c_str(), "%dx%d", &width, &height) != 2 || width < 8
@@ -58,6 +63,10 @@ int main(int argc, char** argv)
             distance = std::atof(value.c_str());
         } else if (Value(argv[i], "--turn", &value)) {
             turn = std::atof(value.c_str());
+        } else if (Value(argv[i], "--pitch", &value)) {
+            tilt = std::atof(value.c_str());
+        } else if (Value(argv[i], "--origin", &value)) {
+            origin = value;
         } else if (Value(argv[i], "--threads", &value)) {
             threads = std::atoi(value.c_str());
         } else if (Value(argv[i], "--frames", &value)) {
@@ -91,12 +100,34 @@ int main(int argc, char** argv)
         BRect(0, 0, float(width - 1), float(height - 1)), "UniverseView", &universe, threads);
     view.InitOffscreen();
     view.cameraDistance = distance;
+    if (!origin.empty()) {
+        const StarSystem* found = nullptr;
+        for (int32_t i = 0; i < universe.CountItems() && !found; i++) {
+            const StarSystem* system = universe.SystemAt(i);
+            for (int32_t s = 0; s < system->CountItems() && !found; s++) {
+                if (origin == system->StarAt(s)->GetName()) {
+                    found = system;
+                    view.originSystem = i;
+                }
+            }
+        }
+        if (!found) {
+            std::fprintf(stderr, "nightdome-chartshot: no star named '%s' in %s\n", origin.c_str(),
+                catalogue.c_str());
+            return 1;
+        }
+        // Straight there, without the glide a click starts.
+        view.originOffset.Set(-found->position.x, -found->position.y, -found->position.z);
+        view.cameraPosition = view.originOffset;
+    }
     *view.GetRadialVelocityY() = turn;
+    view.radialVelocityX = tilt / 0.9; // the first frame's step damps it by 0.9
     view.HideGreaterThan(*view.GetDistanceFilter());
     view.CalculateLumCache();
     for (int f = 0; f < frames; f++) {
         view.NextTransform();
         *view.GetRadialVelocityY() = 0;
+        view.radialVelocityX = 0;
     }
     view.Render();
     if (!ImageOf(*view.Offscreen()).save(QString::fromStdString(output), "PNG")) {
