@@ -10,6 +10,7 @@
 #include <map>
 #include <set>
 #include <tuple>
+#include <unordered_map>
 
 namespace {
 
@@ -91,8 +92,19 @@ std::vector<std::pair<size_t, size_t>> MatchStars(
     std::sort(byDec.begin(), byDec.end(),
         [&](size_t a, size_t b) { return std::tie(first[a].dec, a) < std::tie(first[b].dec, b); });
 
-    // (tier, score, second, first): tier 0 is the close rule, tier 1 the wide one.
+    // (tier, score, second, first): tier -1 the same Gaia source, 0 the close rule, 1 the wide
+    // one.
     std::vector<std::tuple<int, double, size_t, size_t>> candidates;
+    std::unordered_map<uint64_t, size_t> byGaiaId;
+    for (size_t i = 0; i < first.size(); i++) {
+        if (first[i].gaiaId != 0)
+            byGaiaId.emplace(first[i].gaiaId, i);
+    }
+    for (size_t s = 0; s < second.size(); s++) {
+        const auto found = second[s].gaiaId != 0 ? byGaiaId.find(second[s].gaiaId) : byGaiaId.end();
+        if (found != byGaiaId.end())
+            candidates.emplace_back(-1, 0.0, s, found->second);
+    }
     const double band = kWideMatchArcsec / kArcsecPerRadian;
     for (size_t s = 0; s < second.size(); s++) {
         const ImportStar& star = second[s];

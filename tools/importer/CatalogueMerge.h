@@ -8,8 +8,9 @@
 #include <string>
 #include <vector>
 
-// The rule: a star of the second catalogue and one of the first are the same star when they
-// lie within kMatchArcsec of each other and their visual magnitudes differ by at most
+// The rule: a star of the second catalogue and one of the first are the same star when both
+// name the same Gaia source (ImportStar::gaiaId), whatever their place and brightness; else when
+// they lie within kMatchArcsec of each other and their visual magnitudes differ by at most
 // kMatchMagnitudes; failing that, when they lie within kWideMatchArcsec, their magnitudes
 // differ by at most kWideMatchMagnitudes and their distances by at most kWideMatchDistance
 // (a fraction of the second's). Both catalogues give J2000 positions. Pairs are taken closest

@@ -405,6 +405,7 @@ void ReadGaiaStars(std::string_view bytes, const std::string& file, const GaiaLa
             star.ra += 2 * kPI;
         star.dec = std::asin(std::clamp(d[2] / n, -1.0, 1.0));
         star.parallax = r.parallax;
+        star.gaiaId = r.sourceId;
         star.absoluteMagnitude = r.v + 5 + 5 * std::log10(r.parallax / 1000);
         if (!(star.absoluteMagnitude >= kMinMagnitude && star.absoluteMagnitude <= kMaxMagnitude))
             Refuse(file, at + 34, "an absolute magnitude out of range");

@@ -36,6 +36,9 @@ struct ImportStar {
     // The star's own letter in its multiple system as its source publishes it ('A' to 'Z'), 0
     // when it gives none; a name the star shares with its companions takes this letter.
     char component = 0;
+    // The star's Gaia DR3 source id, 0 when its catalogue gives none: the same id in two
+    // catalogues is the same star.
+    uint64_t gaiaId = 0;
     // The star's other names ("HD 48915", "alf CMa", "Gaia DR3 ..."), each ended by a tab;
     // the shown name may be among them and is left out when they are written.
     std::string aliases;

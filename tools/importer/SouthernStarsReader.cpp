@@ -9,6 +9,7 @@
 
 #include <algorithm>
 #include <cctype>
+#include <charconv>
 #include <cmath>
 
 namespace {
@@ -113,9 +114,15 @@ void NameFromIds(ImportStar& star, const std::string& names, const std::string& 
         const std::vector<std::string> forms = DesignationForms(id);
         for (const std::string& form : forms)
             AddAlias(star, form);
-        if (forms.empty() && id.rfind("GAIA ", 0) == 0)
+        if (forms.empty() && id.rfind("GAIA ", 0) == 0) {
             AddAlias(star, "Gaia DR3 " + CleanName(id.substr(5)));
-        else if (forms.empty())
+            uint64_t source = 0;
+            const std::string digits = CleanName(id.substr(5));
+            const auto [end, error]
+                = std::from_chars(digits.data(), digits.data() + digits.size(), source);
+            if (error == std::errc() && end == digits.data() + digits.size())
+                star.gaiaId = source;
+        } else if (forms.empty())
             AddAlias(star, CleanName(id));
     }
 }
