@@ -32,6 +32,13 @@ const char* ProgramVersion()
     return ND_VERSION;
 }
 
+const char* ProgramSky()
+{
+    // Given by the build, which made the default catalogue from the Gaia, the kstars-data or
+    // no catalogue at all.
+    return ND_SKY;
+}
+
 ParsedCommandLine ParseCommandLine(const QStringList& arguments)
 {
     QCommandLineParser parser;
@@ -39,7 +46,11 @@ ParsedCommandLine ParseCommandLine(const QStringList& arguments)
         "An interactive 3D map of the stars around the Sun.\n\n"
         "Without options it reads the star catalogue stars.dat found beside the program, in\n"
         "$XDG_DATA_HOME/nightdome, in the installation's share/nightdome or in the nightdome\n"
-        "folder of $XDG_DATA_DIRS, in that order.");
+        "folder of $XDG_DATA_DIRS, in that order. The default catalogue is made from the Gaia\n"
+        "DR3 and Hipparcos catalogue of Debian's stellarium-data (Gaia data: ESA/Gaia/DPAC,\n"
+        "CC BY-SA 3.0 IGO; packaging GPL-2+), or else the Hipparcos-derived catalogue of\n"
+        "Debian's kstars-data, with the nearest and brightest stars of Southern Stars Group;\n"
+        "--version names the one this program was built with.");
     const QCommandLineOption help({ "h", "help" }, "Show this help and exit.");
     const QCommandLineOption version({ "v", "version" }, "Show the version and exit.");
     const QCommandLineOption catalogue({ "c", "catalogue" },
@@ -72,7 +83,8 @@ ParsedCommandLine ParseCommandLine(const QStringList& arguments)
         return parsed;
     }
     if (parser.isSet(version)) {
-        parsed.output = std::string("nightdome ") + ProgramVersion() + "\n";
+        parsed.output
+            = std::string("nightdome ") + ProgramVersion() + "\nSky: " + ProgramSky() + "\n";
         return parsed;
     }
     if (!parser.positionalArguments().isEmpty()) {

@@ -31,3 +31,6 @@ ParsedCommandLine ParseCommandLine(const QStringList& arguments);
 
 // The version the program reports.
 const char* ProgramVersion();
+
+// The sky the build made the default catalogue from, for instance "Hipparcos (kstars-data)".
+const char* ProgramSky();

@@ -1,7 +1,10 @@
 // The command line: every option, good and bad, and what the program then starts with.
 #include "app/CommandLine.h"
 
+#include <cstdint>
+#include <fstream>
 #include <gtest/gtest.h>
+#include <string>
 
 namespace {
 
@@ -47,7 +50,8 @@ TEST(CommandLine, HelpListsEveryOptionAndExitsWell)
         EXPECT_TRUE(parsed.error.empty());
         EXPECT_EQ(parsed.output.rfind("Usage: nightdome [options]", 0), 0u) << parsed.output;
         for (const char* option : { "--catalogue <FILE>", "--generate <N>", "--threads <N>",
-                 "--help", "--version", "XDG_DATA_DIRS" })
+                 "--help", "--version", "XDG_DATA_DIRS", "ESA/Gaia/DPAC", "CC BY-SA 3.0 IGO",
+                 "stellarium-data", "kstars-data", "Southern Stars Group" })
             EXPECT_NE(parsed.output.find(option), std::string::npos) << option;
         // Qt's own options are let through but not advertised.
         EXPECT_EQ(parsed.output.find("platform"), std::string::npos);
@@ -60,9 +64,41 @@ TEST(CommandLine, VersionPrintsTheVersion)
         const ParsedCommandLine parsed = Parse({ version });
         EXPECT_FALSE(parsed.start);
         EXPECT_EQ(parsed.exitStatus, 0);
-        EXPECT_EQ(parsed.output, std::string("nightdome ") + ProgramVersion() + "\n");
+        EXPECT_EQ(parsed.output,
+            std::string("nightdome ") + ProgramVersion() + "\nSky: " + ProgramSky() + "\n");
     }
     EXPECT_STREQ(ProgramVersion(), ND_VERSION);
+}
+
+// The sky --version names is the one the build put beside the program: the Gaia sky comes with
+// its companion names file and far more systems than the Hipparcos one could hold.
+TEST(CommandLine, VersionNamesTheSkyTheBuildMade)
+{
+    const std::string sky = ProgramSky();
+    EXPECT_EQ(sky, ND_SKY);
+    const std::string output = Parse({ "--version" }).output;
+    EXPECT_NE(output.find("\nSky: " + sky + "\n"), std::string::npos) << output;
+
+    std::ifstream catalogue(ND_APP_DIR "/stars.dat");
+    if (!catalogue) {
+        EXPECT_EQ(sky.rfind("none (", 0), 0u) << sky;
+        return;
+    }
+    std::string line;
+    int64_t lines = 0;
+    while (std::getline(catalogue, line))
+        lines++;
+    const int64_t stars = lines / 2;
+    const bool names = std::ifstream(ND_APP_DIR "/stars.names").good();
+    if (sky.rfind("Gaia DR3 and Hipparcos (stellarium-data ", 0) == 0) {
+        EXPECT_NE(sky.find(") with the 10-parsec census"), std::string::npos) << sky;
+        EXPECT_GT(stars, 500000);
+        EXPECT_TRUE(names);
+    } else {
+        EXPECT_EQ(sky, "Hipparcos (kstars-data)");
+        EXPECT_GT(stars, 100000);
+        EXPECT_LT(stars, 130000);
+    }
 }
 
 TEST(CommandLine, CatalogueTakesAnyFileName)

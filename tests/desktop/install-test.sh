@@ -25,6 +25,8 @@ if [ ! -s "$catalogue" ]; then
     fail "share/nightdome/stars.dat is not installed"
 elif [ "$(head -n 1 "$catalogue")" != "The Sun" ]; then
     fail "the installed catalogue does not start with the Sun"
+elif [ "$(sed -n 2p "${catalogue%.dat}.names" 2>/dev/null | cut -d' ' -f2)" != "$(wc -c <"$catalogue")" ]; then
+    fail "share/nightdome/stars.names is not installed beside the stars.dat it belongs to"
 fi
 
 entry="$prefix/share/applications/$id.desktop"
@@ -74,8 +76,11 @@ help=$(run "$prefix/bin/nightdome" --help)
 for option in --catalogue --generate --threads --help --version; do
     grep -q -- "$option" <<<"$help" || fail "nightdome --help does not mention $option"
 done
-[ "$(run "$prefix/bin/nightdome" --version)" = "nightdome $version" ] \
+version_lines=$(run "$prefix/bin/nightdome" --version)
+[ "$(head -n 1 <<<"$version_lines")" = "nightdome $version" ] \
     || fail "nightdome --version does not print 'nightdome $version'"
+grep -qE "^Sky: .*\((stellarium|kstars)-data.*\)" <<<"$version_lines" \
+    || fail "nightdome --version does not name the sky: $version_lines"
 error=$(run "$prefix/bin/nightdome" --bogus 2>&1 >/dev/null)
 code=$?
 [ $code -eq 2 ] || fail "nightdome --bogus exits with $code, not 2"

@@ -11,16 +11,8 @@
 set -uo pipefail
 
 setup=${1:-$(cd "$(dirname "$0")/../.." && pwd)/scripts/setup}
-work=$(mktemp -d)
-trap 'rm -rf "$work"' EXIT
-failures=0
-case_name=""
-
-fail()
-{
-    echo "FAIL [$case_name]: $*" >&2
-    failures=$((failures + 1))
-}
+# shellcheck source=cases.sh
+. "$(dirname "$0")/cases.sh"
 
 # The real tools the set-up script and the stand-ins use; nothing else is on their PATH.
 mkdir -p "$work/tools" "$work/fakes" "$work/sudo"
@@ -601,8 +593,4 @@ case_name="system-apt-sources-untouched"
 [ "$(find "$work/apt" -type f -exec md5sum {} + | sort)" = "$apt_sources_before" ] \
     || fail "the apt sources the set-up read were changed"
 
-if [ "$failures" -ne 0 ]; then
-    echo "setup-test: $failures failed checks" >&2
-    exit 1
-fi
-echo "setup-test: all cases passed"
+finish setup-test
