@@ -25,6 +25,10 @@ Options:
   --distance=PC     the camera's distance from the origin in parsecs (default 25)
   --turn=RADIANS    turn the chart about the vertical axis first (default 0)
   --pitch=RADIANS   then tilt it about the screen's horizontal axis (default 0)
+  --brightness=F    the brightness factor the chart's brightness slider sets (default 2000)
+  --contrast=F      the stellar contrast its contrast slider sets (default 1)
+  --clip=PC         hide the systems farther than PC parsecs from the origin, as the
+                    chart's distance slider does (default: none)
   --origin=NAME     make the system of the star named NAME the origin, as a click on
                     it in the chart does (default: the Sun)
   --threads=N       render threads (default 1)
@@ -49,7 +53,7 @@ int main(int argc, char** argv)
     QApplication application(argc, argv);
 
     int width = 640, height = 480, threads = 1, frames = 1;
-    double distance = 25, turn = 0, tilt = 0;
+    double distance = 25, turn = 0, tilt = 0, brightness = 2000, contrast = 1, clip = -1;
     std::string catalogue, output, value, origin;
     for (int i = 1; i < argc; i++) {
         if (Value(argv[i], "--size", &value)) {
@@ -65,6 +69,12 @@ int main(int argc, char** argv)
             turn = std::atof(value.c_str());
         } else if (Value(argv[i], "--pitch", &value)) {
             tilt = std::atof(value.c_str());
+        } else if (Value(argv[i], "--brightness", &value)) {
+            brightness = std::atof(value.c_str());
+        } else if (Value(argv[i], "--clip", &value)) {
+            clip = std::atof(value.c_str());
+        } else if (Value(argv[i], "--contrast", &value)) {
+            contrast = std::atof(value.c_str());
         } else if (Value(argv[i], "--origin", &value)) {
             origin = value;
         } else if (Value(argv[i], "--threads", &value)) {
@@ -100,6 +110,8 @@ int main(int argc, char** argv)
         BRect(0, 0, float(width - 1), float(height - 1)), "UniverseView", &universe, threads);
     view.InitOffscreen();
     view.cameraDistance = distance;
+    *view.GetLumFactor() = brightness;
+    *view.GetStellarContrast() = contrast;
     if (!origin.empty()) {
         const StarSystem* found = nullptr;
         for (int32_t i = 0; i < universe.CountItems() && !found; i++) {
@@ -122,6 +134,8 @@ int main(int argc, char** argv)
     }
     *view.GetRadialVelocityY() = turn;
     view.radialVelocityX = tilt / 0.9; // the first frame's step damps it by 0.9
+    if (clip >= 0)
+        *view.GetDistanceFilter() = clip;
     view.HideGreaterThan(*view.GetDistanceFilter());
     view.CalculateLumCache();
     for (int f = 0; f < frames; f++) {
