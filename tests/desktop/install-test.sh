@@ -64,6 +64,15 @@ done
 [ -s "$prefix/share/doc/nightdome/COPYING" ] || fail "the licence is not installed"
 [ -s "$prefix/share/doc/nightdome/southern-stars/README.md" ] \
     || fail "the star data's credit is not installed"
+# The Gaia data of the default sky is credited with its licence wherever the data is.
+for credit in "ESA/Gaia/DPAC" "CC BY-SA 3.0 IGO"; do
+    grep -qF "$credit" "$prefix/share/doc/nightdome/README.md" \
+        || fail "the installed README does not say \"$credit\""
+    grep -qF "${credit//-/\\-}" "$prefix/share/man/man1/nightdome.1" \
+        || fail "nightdome(1) does not say \"$credit\""
+done
+grep -q "<project_license>.*CC-BY-SA-3.0-IGO</project_license>" "$metainfo" \
+    || fail "the metainfo's licence leaves out the Gaia data's"
 
 # The installed commands, from another folder and with no display to connect to.
 elsewhere=$(mktemp -d)
