@@ -3,6 +3,7 @@
 #pragma once
 
 #include "catalog/SpectralClass.h"
+#include "catalog/StarNames.h"
 #include "catalog/StarSystem.h"
 #include "core/Random.h"
 #include "platform/BList.h"
@@ -51,6 +52,11 @@ public:
     Universe& operator=(const Universe&) = delete;
 
     StarSystem* SystemAt(int32_t index) const { return static_cast<StarSystem*>(ItemAt(index)); }
+
+    // Every other name of the stars, by system: filled from a names file beside the catalogue
+    // (ReadStarNames) before the universe is shown, only read after that. Empty when there is
+    // none.
+    StarNames otherNames;
 
 private:
     // Appends count unnamed, starless systems at random positions drawn from random.
