@@ -4,8 +4,10 @@
 #include "catalog/Star.h"
 #include "catalog/Universe.h"
 #include "tools/importer/CatalogueWriter.h"
+#include "tools/importer/GaiaCatalogue.h"
 #include "tools/importer/SourceReaders.h"
 
+#include <algorithm>
 #include <cmath>
 #include <cstdio>
 #include <cstdlib>
@@ -79,6 +81,68 @@ std::vector<Written> SplitRecords(const std::string& text)
     return records;
 }
 
+// What write writes to a file, as text; an exception it throws goes on to the caller.
+template <typename F> std::string Captured(F write)
+{
+    char* buffer = nullptr;
+    size_t length = 0;
+    std::FILE* out = open_memstream(&buffer, &length);
+    FuzzCheck(out != nullptr, "cannot open a memory stream");
+    try {
+        write(out);
+    } catch (...) {
+        std::fclose(out);
+        std::free(buffer);
+        throw;
+    }
+    std::fclose(out);
+    std::string text(buffer, length);
+    std::free(buffer);
+    return text;
+}
+
+// The names file FormatNames writes for the records of a catalogue of catalogueBytes bytes:
+// its header, then lines of increasing star index, each naming a star of the catalogue and
+// holding 1-79 printable ASCII characters a name, none twice and never the star's own name.
+void CheckNamesFile(
+    const std::string& names, const std::vector<Written>& records, size_t catalogueBytes)
+{
+    const std::string header = "nightdome names 1\n" + std::to_string(records.size()) + " "
+        + std::to_string(catalogueBytes) + "\n";
+    FuzzCheck(names.compare(0, header.size(), header) == 0,
+        "the names file's header does not match its catalogue");
+    FuzzCheck(names.back() == '\n', "the names file does not end with a line feed");
+    long long previous = 0;
+    for (size_t start = header.size(); start < names.size();) {
+        const size_t feed = names.find('\n', start);
+        const std::string line = names.substr(start, feed - start);
+        start = feed + 1;
+        size_t tab = line.find('\t');
+        FuzzCheck(tab != std::string::npos && tab > 0, "a names line without an index and a name");
+        const std::string index = line.substr(0, tab);
+        FuzzCheck(index.find_first_not_of("0123456789") == std::string::npos,
+            "a names line's index is no number");
+        const long long star = std::stoll(index);
+        FuzzCheck(star > previous, "the names file's star indexes do not increase");
+        FuzzCheck(static_cast<size_t>(star) < records.size(), "a names line names no star");
+        previous = star;
+        std::vector<std::string> seen;
+        while (tab != std::string::npos) {
+            const size_t next = line.find('\t', tab + 1);
+            const std::string name = line.substr(tab + 1, next - tab - 1);
+            tab = next;
+            FuzzCheck(!name.empty() && name.size() <= 79, "another name is empty or too long");
+            for (const char c : name)
+                FuzzCheck(c >= ' ' && c <= '~', "another name is not printable ASCII");
+            FuzzCheck(name != records[static_cast<size_t>(star)].name,
+                "a star's own name is among its other names");
+            FuzzCheck(std::find(seen.begin(), seen.end(), name) == seen.end(),
+                "a star has another name twice");
+            seen.push_back(name);
+        }
+    }
+}
+
 } // namespace
 
 void FuzzCheck(bool condition, const char* message)
@@ -109,10 +173,19 @@ void CheckImportRoundTrip(const uint8_t* data, size_t size, InputFormat format)
         case InputFormat::Guess:
             ReadPlainCsv(in, "fuzz", stars, report);
             break;
+        case InputFormat::Gaia:
+            ReadGaiaStars(std::string_view(reinterpret_cast<const char*>(data), size), "fuzz",
+                GaiaLabels {}, stars, report);
+            break;
         }
     } catch (const ImportError&) {
         return;
     }
+    CheckStarsRoundTrip(stars);
+}
+
+void CheckStarsRoundTrip(const std::vector<ImportStar>& stars)
+{
     if (stars.empty())
         return;
 
@@ -125,21 +198,12 @@ void CheckImportRoundTrip(const uint8_t* data, size_t size, InputFormat format)
         }
     }
 
-    char* buffer = nullptr;
-    size_t length = 0;
-    std::FILE* out = open_memstream(&buffer, &length);
-    FuzzCheck(out != nullptr, "cannot open a memory stream");
-    bool written = true;
+    std::string text;
     try {
-        FormatCatalogue(out, stars, systems);
+        text = Captured([&](std::FILE* out) { FormatCatalogue(out, stars, systems); });
     } catch (const ImportError&) {
-        written = false; // the writer's last guard refused: an error message, not a bad file
+        return; // the writer's last guard refused: an error message, not a bad file
     }
-    std::fclose(out);
-    const std::string text(buffer, length);
-    std::free(buffer);
-    if (!written)
-        return;
 
     // The text itself: every record as meant, every line one the reader reads whole.
     const std::vector<Written> records = SplitRecords(text);
@@ -157,6 +221,13 @@ void CheckImportRoundTrip(const uint8_t* data, size_t size, InputFormat format)
         for (size_t f = 1; f < 5; f++)
             FiniteField(r.fields[f]);
     }
+
+    // The other names written for the same stars.
+    WriteSummary summary;
+    const std::string names = Captured([&](std::FILE* out) {
+        FormatNames(out, stars, systems, static_cast<int64_t>(text.size()), summary);
+    });
+    CheckNamesFile(names, records, text.size());
 
     // The program's reader on the same text: the same stars, the same systems.
     std::unique_ptr<std::FILE, int (*)(std::FILE*)> file(

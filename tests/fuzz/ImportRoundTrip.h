@@ -6,6 +6,7 @@
 
 #include <cstddef>
 #include <cstdint>
+#include <vector>
 
 // Reads data as a catalogue of format. When the importer accepts it, groups the stars, writes
 // the catalogue text and reads it back through the program's reader. Aborts, saying what
@@ -14,6 +15,9 @@
 // back are not the stars written, in order, with their systems. Input the importer refuses
 // is fine.
 void CheckImportRoundTrip(const uint8_t* data, size_t size, InputFormat format);
+
+// The same check for stars a reader has read: grouped, written and read back.
+void CheckStarsRoundTrip(const std::vector<ImportStar>& stars);
 
 // Aborts with message when condition is false; for harnesses, which have no test framework.
 void FuzzCheck(bool condition, const char* message);
