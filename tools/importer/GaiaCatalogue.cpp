@@ -235,7 +235,10 @@ struct GaiaRecord {
     double direction[3]; // unit vector at the file's epoch
     double motion[3]; // microarcseconds a year
     double bv, v; // magnitudes
-    double parallax, parallaxError; // milliarcseconds
+    double parallax; // milliarcseconds
+    // The parallax and its error in units of 0.01 mas, whole numbers, for comparing them
+    // without rounding.
+    uint32_t parallaxHundredths, errorHundredths;
     int spectralLine;
     uint32_t hip;
     int component;
@@ -252,7 +255,8 @@ GaiaRecord Decode(std::string_view bytes, size_t at)
     r.bv = Little<int16_t>(bytes, at + 32) / 1000.0;
     r.v = Little<int16_t>(bytes, at + 34) / 1000.0;
     r.parallax = Little<uint16_t>(bytes, at + 36) * 0.02;
-    r.parallaxError = Little<uint16_t>(bytes, at + 38) * 0.01;
+    r.parallaxHundredths = 2u * Little<uint16_t>(bytes, at + 36);
+    r.errorHundredths = Little<uint16_t>(bytes, at + 38);
     r.spectralLine = Little<uint16_t>(bytes, at + 42);
     const uint32_t hipAndComponent = static_cast<unsigned char>(bytes[at + 45])
         | static_cast<unsigned char>(bytes[at + 46]) << 8
@@ -358,19 +362,27 @@ void ReadGaiaStars(std::string_view bytes, const std::string& file, const GaiaLa
     if (countsEnd > bytes.size())
         Refuse(file, bytes.size(),
             "the file ends within its table of " + std::to_string(zones) + " zone counts");
-    size_t total = 0;
+    // At most 20 * 4^12 + 1 counts, each under 2^31: the total cannot overflow.
+    uint64_t total = 0;
     const size_t room = (bytes.size() - countsEnd) / kGaiaRecordBytes;
+    size_t overrun = 0; // the count that takes the total past the room, 0 while none has
     for (size_t z = 0; z < zones; z++) {
         const int32_t count = Little<int32_t>(bytes, kGaiaHeaderBytes + 4 * z);
         if (count < 0)
             Refuse(file, kGaiaHeaderBytes + 4 * z,
                 "zone " + std::to_string(z) + " holds " + std::to_string(count) + " stars");
-        total += static_cast<size_t>(count);
-        if (total > room)
-            Refuse(file, kGaiaHeaderBytes + 4 * z,
-                "the zone counts add up to more stars than the file holds (" + std::to_string(room)
-                    + ")");
+        total += static_cast<uint64_t>(count);
+        if (total > room && overrun == 0)
+            overrun = kGaiaHeaderBytes + 4 * z;
     }
+    if (total > room && (bytes.size() - countsEnd) % kGaiaRecordBytes != 0)
+        Refuse(file, countsEnd + room * kGaiaRecordBytes,
+            "the file ends within star " + std::to_string(room + 1) + " of the "
+                + std::to_string(total) + " its zone counts name");
+    if (total > room)
+        Refuse(file, overrun,
+            "the zone counts name " + std::to_string(total) + " stars, the file holds "
+                + std::to_string(room));
     const size_t end = countsEnd + total * kGaiaRecordBytes;
     if (end != bytes.size())
         Refuse(file, end,
@@ -389,7 +401,9 @@ void ReadGaiaStars(std::string_view bytes, const std::string& file, const GaiaLa
             report.Skip("without a parallax");
             continue;
         }
-        if (r.parallax < kGaiaParallaxSigmas * r.parallaxError) {
+        // In whole hundredths of a milliarcsecond: 1.70 mas is five times 0.34 mas, though
+        // 85 * 0.02 falls short of 5 * (34 * 0.01) in floating point.
+        if (r.parallaxHundredths < kGaiaParallaxSigmas * r.errorHundredths) {
             report.Skip("with a parallax under five times its error");
             continue;
         }
