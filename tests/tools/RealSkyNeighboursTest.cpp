@@ -94,6 +94,21 @@ TEST_F(RealSky, TheFaintNeighbours)
     }
 }
 
+// Where Barnard's Star stood at J2000 (it moves 10.4" a year): 17 h 57 m 48.5 s, +4 41' 36".
+TEST_F(RealSky, BarnardsStarStandsAtItsJ2000Place)
+{
+    const StarSystem* barnard = FindSystem(Sky(), "Barnard's Star");
+    ASSERT_NE(barnard, nullptr);
+    EXPECT_NEAR(Distance(barnard), 1.83, 0.0183);
+    const double ra = (17 + 57 / 60.0 + 48.5 / 3600) * M_PI / 12;
+    const double dec = (4 + 41 / 60.0 + 36 / 3600.0) * M_PI / 180;
+    const SVector& p = barnard->position;
+    const double cosine = (std::cos(dec) * std::cos(ra) * p.x + std::sin(dec) * p.y
+                              + std::cos(dec) * std::sin(ra) * p.z)
+        / p.Magnitude();
+    EXPECT_LT(std::acos(std::clamp(cosine, -1.0, 1.0)) * 180 / M_PI * 60, 1.0) << "arc-minutes";
+}
+
 TEST_F(RealSky, SiriusBIsAWhiteDwarfInSiriussSystem)
 {
     const StarSystem* sirius = FindSystem(Sky(), "Sirius");
