@@ -1,5 +1,5 @@
-// Finds systems by the names of their members: whole name, part of a name or its start,
-// with or without regard to case.
+// Finds systems by the names of their members, and by the other names those stars go by: whole
+// name, part of a name or its start, with or without regard to case.
 #pragma once
 
 #include "core/MessageCodes.h"
@@ -43,7 +43,13 @@ private:
     bool Contains() const;
     bool StartsWith() const;
     void FillLowerTable(); // asks tolower, in the locale in force now, for every byte value
+    // The bytes a name may hold where the pattern starts: its first byte, and without regard to
+    // case every byte that lower-cases to it; none (0) when the pattern is empty or more than
+    // two bytes do.
+    void FindFirstBytes(bool caseSensitive);
 
     unsigned char lower[256]; // tolower of every byte value: made with the query, and again by
                               // each run without regard to case
+    unsigned char firstBytes[2] = {}; // as FindFirstBytes finds them for the run
+    int32_t firstByteCount = 0;
 };

@@ -15,6 +15,7 @@
 
 #include <cmath>
 #include <cstddef>
+#include <cstring>
 #include <set>
 #include <vector>
 
@@ -248,6 +249,54 @@ TEST(StarSysQuery, NameContainsNeverSelectsAnEmptyName)
     param.mode = 3;
     param.text = "";
     EXPECT_TRUE(Matches(query, &param).empty());
+}
+
+TEST(StarSysQuery, NamesFindASystemByAnyOtherNameOfAnyOfItsStars)
+{
+    Universe u(20);
+    const int32_t sun = AddTestSystem(u, 0, 0, 0, { { "The Sun", "G2V", 4.83 } });
+    const int32_t alpha = AddTestSystem(
+        u, 1, 0, 0, { { "Rigil Kentaurus", "G2V", 4.38 }, { "Toliman", "K1V", 5.71 } });
+    const int32_t proxima = AddTestSystem(u, 2, 0, 0, { { "Proxima Centauri", "M5.5Ve", 15.5 } });
+    const int32_t plain = AddTestSystem(u, 3, 0, 0, { { "HIP 1", "K0V", 6 } });
+    const auto add = [&u](int32_t system, const char* name) {
+        ASSERT_TRUE(u.otherNames.Add(system, name, std::strlen(name)));
+    };
+    add(alpha, "alf Cen A");
+    add(alpha, "HIP 71683");
+    add(alpha, "HD 128620");
+    add(alpha, "alf Cen B"); // the second star's
+    add(alpha, "HIP 71681");
+    add(proxima, "GJ 551");
+    add(proxima, "Gaia DR3 5853498713190525696");
+
+    StarNameQuery query(&u);
+    const auto find = [&query](int32_t mode, const char* text, bool caseSensitive) {
+        NameQueryParam param { mode, text, caseSensitive };
+        return Matches(query, &param);
+    };
+    using Set = std::set<int32_t>;
+    EXPECT_EQ(find(kNameIs, "ALF cen b", false), Set { alpha });
+    EXPECT_EQ(find(kNameIs, "ALF cen b", true), Set {});
+    EXPECT_EQ(find(kNameIs, "alf Cen B", true), Set { alpha });
+    EXPECT_EQ(find(kNameIs, "alf Cen", false), Set {}); // whole names only
+    EXPECT_EQ(find(kNameIs, "hip 71683", false), Set { alpha });
+    EXPECT_EQ(find(kNameIs, "HD 128620", true), Set { alpha });
+    EXPECT_EQ(find(kNameIs, "gj 551", false), Set { proxima });
+    EXPECT_EQ(find(kNameIs, "Gaia DR3 5853498713190525696", false), Set { proxima });
+    EXPECT_EQ(find(kNameStartsWith, "alf cen", false), Set { alpha });
+    EXPECT_EQ(find(kNameStartsWith, "HIP ", false), (Set { alpha, plain }));
+    EXPECT_EQ(find(kNameStartsWith, "hip ", true), Set {});
+    EXPECT_EQ(find(kNameContains, "cen", false), (Set { alpha, proxima }));
+    EXPECT_EQ(find(kNameContains, "Cen B", true), Set { alpha });
+    EXPECT_EQ(find(kNameContains, "5853498713190525696", true), Set { proxima });
+    EXPECT_EQ(find(kNameContains, "55", false), Set { proxima });
+    EXPECT_EQ(find(kNameContains, "", false), (Set { sun, alpha, proxima, plain }));
+    EXPECT_EQ(find(3, "GJ 551", false), Set {});
+    EXPECT_EQ(find(-1, "", true), Set {});
+    // The stars and systems keep their own names.
+    EXPECT_STREQ(u.SystemAt(alpha)->GetName(), "Rigil Kentaurus");
+    EXPECT_STREQ(u.SystemAt(proxima)->StarAt(0)->GetName(), "Proxima Centauri");
 }
 
 TEST(StarSysQuery, NameQueryLowerCasesIntoItsOwnBuffers)
