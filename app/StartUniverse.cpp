@@ -156,6 +156,93 @@ void TellFlaws(
     }
 }
 
+// "1 name" or "n names".
+std::string Names(int64_t n)
+{
+    return std::to_string(n) + (n == 1 ? " name" : " names");
+}
+
+// The names file beside the catalogue at path read into universe, and what it met told: one
+// line of standard error for each kind of problem, the first on the help line unless the
+// catalogue had something to say there. No names file is nothing to tell.
+void ReadNamesBeside(const std::filesystem::path& catalogue, bool cut, StartedUniverse* started)
+{
+    std::filesystem::path path = catalogue;
+    path.replace_extension(".names");
+    std::error_code error;
+    if (!std::filesystem::exists(path, error))
+        return;
+    const std::string named = "nightdome: " + Quoted(path);
+    const std::string plain = "; the stars keep only their own names\n";
+    const auto help = [&path, &started](const std::string& before, const std::string& after) {
+        if (started->helpLine.empty())
+            started->helpLine = HelpLine(before, path, after);
+    };
+    const auto cannot = [&](const std::string& reason) {
+        started->report
+            += "nightdome: cannot read the star names " + Quoted(path) + ": " + reason + plain;
+        help("Cannot read ", ": " + reason);
+    };
+    if (std::filesystem::is_directory(path, error))
+        return cannot("it is a folder");
+    std::unique_ptr<std::FILE, int (*)(std::FILE*)> file(
+        std::fopen(path.c_str(), "rb"), &std::fclose);
+    if (!file)
+        return cannot(std::strerror(errno));
+    const uintmax_t bytes = std::filesystem::file_size(catalogue, error);
+    StarNamesReport report;
+    ReadStarNames(file.get(), error ? 0 : uint64_t(bytes), cut, started->universe, &report);
+    if (std::ferror(file.get())) {
+        started->universe->otherNames.Clear();
+        return cannot(std::string("reading failed: ") + std::strerror(errno));
+    }
+    if (report.notNames) {
+        started->report += named + " is not a star names file (its first line is not '"
+            + kStarNamesMagic + "' with the catalogue's star count and size below it)" + plain;
+        help("", " is not a star names file");
+        return;
+    }
+    if (report.stale) {
+        started->report += named + " is stale: it is for a catalogue of "
+            + std::to_string(report.namedStars) + " stars and " + std::to_string(report.namedBytes)
+            + " bytes, " + Quoted(catalogue) + " holds " + std::to_string(report.stars)
+            + " stars in " + std::to_string(report.bytes) + " bytes" + plain;
+        help("", " is stale: names not used");
+        return;
+    }
+    const auto at
+        = [&named](int64_t line) { return named + ", line " + std::to_string(line) + ": "; };
+    if (report.badLines > 0) {
+        static const char* const kCauses[][2] = {
+            { "a star index that is not a number", "bad star index" },
+            { "a star index beyond the catalogue's stars", "no such star" },
+            { "a star index not after the one of the line before", "out of order" },
+            { "a star index without names", "no names" },
+            { "a line longer than 65536 characters", "line too long" },
+        };
+        const char* const* cause = kCauses[report.cause];
+        const std::string lines
+            = std::to_string(report.badLines) + (report.badLines == 1 ? " line" : " lines");
+        started->report += at(report.badLinesLine) + cause[0] + "; " + lines + " passed over\n";
+        help("",
+            ", line " + std::to_string(report.badLinesLine) + ": " + cause[1] + "; " + lines
+                + " bad");
+    }
+    if (report.badNames > 0) {
+        started->report += at(report.badNamesLine)
+            + "a name empty, longer than 79 characters or not printable ASCII; "
+            + Names(report.badNames) + " passed over\n";
+        help("",
+            ", line " + std::to_string(report.badNamesLine) + ": bad name; "
+                + Names(report.badNames) + " bad");
+    }
+    if (report.dropped > 0) {
+        started->report += named + ": more names than the program holds (4 GiB); "
+            + Names(report.dropped) + " passed over\n";
+        help("", ": too many names; " + Names(report.dropped) + " not kept");
+    }
+}
+
 } // namespace
 
 std::vector<std::filesystem::path> CatalogueCandidates()
@@ -243,5 +330,6 @@ StartedUniverse StartUniverse(const StartOptions& options, int32_t maxStars)
         if (started.helpLine.empty())
             started.helpLine = HelpLine("Read only the first " + limit + " stars of ", path, "");
     }
+    ReadNamesBeside(path, cut, &started);
     return started;
 }

@@ -1,7 +1,9 @@
 // The find window of the real program, with and without a window manager: opened from the
 // control window where it belongs, a name typed into its name panel, and the panel's handle
 // dragged onto the chart, which takes the one system found as its origin. A name that finds
-// nothing drags nothing.
+// nothing drags nothing. A system is found by the other names of its stars in the names file
+// beside the catalogue, and shown by its own.
+#include "NamedSky.h"
 #include "ProgramX11Support.h"
 
 namespace {
@@ -169,6 +171,57 @@ TEST_P(FindStar, ANameThatMatchesNothingDragsNothing)
     EXPECT_TRUE(ShowsSirius(found)) << found;
     EXPECT_TRUE(QTest::qWaitFor([] { return MarkerPixelsInTheMiddle() > 0; }, 10000));
 }
+
+namespace {
+
+// The program started with --catalogue on a sky whose stars go by other names too, given in the
+// names file beside it.
+class FindStarByOtherNames : public FindStar {
+protected:
+    void PrepareProgram() override
+    {
+        QFile catalogue(fDir.filePath("sky.dat"));
+        ASSERT_TRUE(catalogue.open(QIODevice::WriteOnly));
+        catalogue.write(kNamedSky);
+        catalogue.close();
+        QFile names(fDir.filePath("sky.names"));
+        ASSERT_TRUE(names.open(QIODevice::WriteOnly));
+        names.write((NamesHeader() + kOtherNames).c_str());
+        names.close();
+        fProgram.setProgram(ND_PROGRAM);
+        fProgram.setArguments({ "--catalogue=" + fDir.filePath("sky.dat") });
+    }
+};
+
+} // namespace
+
+TEST_P(FindStarByOtherNames, ASystemFoundByAnotherNameShowsByItsOwn)
+{
+    const std::string start = WaitForReadOut(kChartOrigin, ShowsTheSun);
+    ASSERT_TRUE(ShowsTheSun(start)) << start;
+    const unsigned long find = OpenFindWindow();
+    ASSERT_NE(find, 0u) << "no find window opened";
+    const QPoint aside = MoveAside(find);
+    ASSERT_GE(aside.x(), kAside.x() - 10) << "the find window did not move";
+
+    // alpha Centauri's system by the Hipparcos number of its first star, then Proxima by its
+    // Gliese number: the chart names each by its own name.
+    const std::pair<const char*, const char*> searches[]
+        = { { "HIP 71683", "Origin: Rigil Kentaurus\n" },
+              { "GJ 551", "Origin: Proxima Centauri\n" },
+              { "Gaia DR3 4472832130942575872", "Origin: Barnard's Star\n" } };
+    for (const auto& [name, shown] : searches) {
+        TypeName(aside, name);
+        DragTheResult(aside, kDropPoint);
+        const std::string found = WaitForReadOut(kChartOrigin,
+            [shown = std::string(shown)](const std::string& t) { return t.rfind(shown, 0) == 0; });
+        EXPECT_EQ(found.rfind(shown, 0), 0u) << name << ":\n" << found;
+    }
+    EXPECT_EQ(fProgram.state(), QProcess::Running);
+}
+
+INSTANTIATE_TEST_SUITE_P(Desktop, FindStarByOtherNames, ::testing::Values(false),
+    [](const ::testing::TestParamInfo<bool>&) { return "OnTheBareServer"; });
 
 INSTANTIATE_TEST_SUITE_P(Desktop, FindStar, ::testing::Values(false, true),
     [](const ::testing::TestParamInfo<bool>& info) {
