@@ -9,7 +9,9 @@
 #include "widgets/InfoView.h"
 
 #include <QMenu>
+#include <cstdio>
 #include <filesystem>
+#include <memory>
 #include <string>
 
 namespace {
@@ -122,4 +124,81 @@ TEST_F(RealSkyPanels, DroppingSiriusOnTheDistancePanelMeasuresFromSirius)
     ASSERT_TRUE(drag.has_value());
     EXPECT_EQ(drag->message.what, kStarMessage);
     EXPECT_EQ(drag->message.FindInt32(kSystemIndexString), sirius);
+}
+
+namespace {
+
+// The real sky with the other names of its stars, read from stars.names beside it.
+class RealSkyOtherNames : public RealSkyPanels {
+protected:
+    static Universe& NamedSky()
+    {
+        static Universe* universe = [] {
+            const std::string dat = std::string(ND_APP_DIR) + "/stars.dat";
+            auto* u = new Universe(dat.c_str(), 1000000, 5000);
+            std::unique_ptr<std::FILE, int (*)(std::FILE*)> names(
+                std::fopen((std::string(ND_APP_DIR) + "/stars.names").c_str(), "rb"), &std::fclose);
+            if (names)
+                ReadStarNames(names.get(), std::filesystem::file_size(dat), false, u, &sReport);
+            return u;
+        }();
+        return *universe;
+    }
+
+    void SetUp() override
+    {
+        RealSkyPanels::SetUp();
+        if (!std::filesystem::exists(std::string(ND_APP_DIR) + "/stars.names"))
+            GTEST_SKIP() << "the sky was built without a names file";
+        ASSERT_GT(NamedSky().otherNames.Count(), 0);
+    }
+
+    // The system the name panel drags one system of for text in mode; -1 for none or a set.
+    static int32_t Find(int mode, const char* text)
+    {
+        NameQueryView panel(kFrame, "Name Query", &NamedSky(), nullptr);
+        panel.queryType->Menu()->actions()[mode]->trigger();
+        panel.starName->SetText(text);
+        const std::optional<CaughtDrag> drag = PressHandle(&panel);
+        if (!drag || drag->message.what != kStarMessage)
+            return -1;
+        return drag->message.FindInt32(kSystemIndexString);
+    }
+
+    static inline StarNamesReport sReport;
+};
+
+} // namespace
+
+TEST_F(RealSkyOtherNames, TheNamesFileFitsTheSkyAndFindsAStarByEveryName)
+{
+    EXPECT_TRUE(sReport.Clean()) << sReport.badLines << " bad lines from line "
+                                 << sReport.badLinesLine << ", " << sReport.badNames
+                                 << " bad names from line " << sReport.badNamesLine;
+    const int32_t alpha = SystemWithStar("Rigil Kentaurus");
+    const int32_t proxima = SystemWithStar("Proxima Centauri");
+    const int32_t barnard = SystemWithStar("Barnard's Star");
+    ASSERT_GE(alpha, 0);
+    ASSERT_GE(proxima, 0);
+    ASSERT_GE(barnard, 0);
+    EXPECT_EQ(Find(kNameIs, "HIP 71683"), alpha);
+    EXPECT_EQ(Find(kNameIs, "hd 128620"), alpha);
+    EXPECT_EQ(Find(kNameIs, "HIP 71681"), alpha); // alpha Centauri B, in the same system
+    EXPECT_EQ(Find(kNameIs, "alf1 Cen"), alpha);
+    EXPECT_EQ(Find(kNameIs, "GJ 551"), proxima);
+    EXPECT_EQ(Find(kNameIs, "Gaia DR3 5853498713190525696"), proxima);
+    EXPECT_EQ(Find(kNameIs, "GJ 699"), barnard);
+    EXPECT_EQ(Find(kNameIs, "Gaia DR3 4472832130942575872"), barnard);
+    // The names alpha Centauri shares with Proxima, its third star, find both systems.
+    for (const char* shared : { "Alpha Centauri", "alf Cen" }) {
+        NameQueryView panel(kFrame, "Name Query", &NamedSky(), nullptr);
+        panel.starName->SetText(shared);
+        ASSERT_TRUE(PressHandle(&panel).has_value()) << shared;
+        EXPECT_TRUE(panel.IsSystemSelected(alpha)) << shared;
+        EXPECT_TRUE(panel.IsSystemSelected(proxima)) << shared;
+        EXPECT_EQ(panel.GetSelectedItems(), 2) << shared;
+    }
+    // The systems keep their own names.
+    EXPECT_STREQ(NamedSky().SystemAt(alpha)->GetName(), "Rigil Kentaurus");
+    EXPECT_STREQ(NamedSky().SystemAt(proxima)->GetName(), "Proxima Centauri");
 }
