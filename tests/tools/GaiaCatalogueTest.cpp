@@ -510,6 +510,12 @@ protected:
         for (const auto& [index, others] : names.others) {
             EXPECT_LT(index, stars.size());
             EXPECT_FALSE(others.empty());
+            for (const std::string& name : others) {
+                EXPECT_TRUE(!name.empty() && name.size() <= 79
+                    && std::all_of(
+                        name.begin(), name.end(), [](char c) { return c >= ' ' && c <= '~'; }))
+                    << "not 1-79 printable ASCII characters: " << name;
+            }
             if (index < stars.size()) {
                 EXPECT_FALSE(Holds(others, stars[index])) << stars[index];
             }
@@ -561,6 +567,10 @@ TEST_F(GaiaCommandTest, FolderIsReadWithItsLabels)
 TEST_F(GaiaCommandTest, ReplacedAndAnnotatedStarsKeepTheirNames)
 {
     const fs::path dir = WriteCatalogue();
+    // An IAU name of more than ASCII for HIP 400, which the table renames: it cannot go to the
+    // names file.
+    WriteBytes(
+        dir / "common_star_names.fab", " 32349|_(\"Sirius\") 2\n   400|_(\"Cital\xC3\xA1\") 2\n");
     // A star of the 10-parsec census where the catalogue has HIP 300, and a bright star's
     // table naming HIP 400.
     const std::string nearest = Write("Nearest.csv",
@@ -594,6 +604,7 @@ TEST_F(GaiaCommandTest, ReplacedAndAnnotatedStarsKeepTheirNames)
     const std::vector<std::string>& relabelled = names.others.at(annotated);
     for (const char* other : { "HIP 400", "HD 8888", "HR 7777" })
         EXPECT_TRUE(Holds(relabelled, other)) << other;
+    EXPECT_FALSE(Holds(relabelled, "Cital\xC3\xA1"));
 }
 
 TEST_F(GaiaCommandTest, BadFilesAreNamedInTheMessage)

@@ -103,7 +103,11 @@ void FormatNames(std::FILE* out, const std::vector<ImportStar>& stars,
             written.assign(1, CleanName(star.name));
             ForEachAlias(star.aliases, [&](const std::string& alias) {
                 std::string clean = CleanName(alias);
-                if (!clean.empty()
+                // The names file holds printable ASCII only; a name with other characters
+                // ("Citalá", the IAU name of a star a table renamed) is left out.
+                const bool ascii = std::all_of(
+                    clean.begin(), clean.end(), [](char c) { return c >= ' ' && c <= '~'; });
+                if (!clean.empty() && ascii
                     && std::find(written.begin(), written.end(), clean) == written.end())
                     written.push_back(std::move(clean));
             });

@@ -23,8 +23,9 @@ struct WriteSummary {
 // ".names" ("stars.dat" -> "stars.names"), or ".names" appended to a name without one.
 std::string NamesFileOf(const std::string& catalogue);
 
-// Writes the stars' other names (ImportStar::aliases, less each star's own name) in the order
-// FormatCatalogue writes the stars, for a catalogue of catalogueBytes bytes:
+// Writes the stars' other names (ImportStar::aliases, less each star's own name and the names
+// that are not printable ASCII) in the order FormatCatalogue writes the stars, for a catalogue
+// of catalogueBytes bytes:
 //   "nightdome names 1"
 //   "<stars in the catalogue> <catalogueBytes>"
 //   "<star index>\t<name>\t<name>..." for each star with other names, the Sun being star 0.
