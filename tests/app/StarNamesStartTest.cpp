@@ -15,6 +15,7 @@
 #include <QFontMetrics>
 #include <QLineEdit>
 #include <QMenu>
+#include <QProcess>
 #include <QTemporaryDir>
 #include <QTest>
 #include <gtest/gtest.h>
@@ -253,4 +254,32 @@ TEST_F(StarNamesStart, EveryHelpLineFits)
             metrics.horizontalAdvance(QString::fromStdString(started.helpLine)), kHelpLineWidth)
             << started.helpLine;
     }
+}
+
+// The real program started with --catalogue on a catalogue whose names file is stale: one line
+// on standard error, and the program comes up all the same.
+TEST_F(StarNamesStart, TheProgramToldOfAStaleNamesFileStartsAllTheSame)
+{
+    Write(fNames, NamesHeader(5) + kOtherNames);
+    QProcess program;
+    QProcessEnvironment offscreen = QProcessEnvironment::systemEnvironment();
+    offscreen.insert("QT_QPA_PLATFORM", "offscreen");
+    program.setProcessEnvironment(offscreen);
+    program.start(ND_PROGRAM, { "--catalogue=" + QString::fromStdString(fCatalogue.string()) });
+    ASSERT_TRUE(program.waitForStarted(10000));
+    const QByteArray expected = QByteArray::fromStdString("nightdome: " + Quoted(fNames)
+        + " is stale: it is for a catalogue of 5 stars and " + std::to_string(sizeof kNamedSky - 1)
+        + " bytes");
+    QByteArray error;
+    const bool said = QTest::qWaitFor(
+        [&] {
+            error += program.readAllStandardError();
+            return error.contains(expected) && error.endsWith('\n');
+        },
+        30000);
+    EXPECT_TRUE(said) << error.toStdString();
+    EXPECT_EQ(error.count("nightdome:"), 1) << error.toStdString();
+    EXPECT_EQ(program.state(), QProcess::Running);
+    program.kill();
+    program.waitForFinished(10000);
 }
