@@ -1,6 +1,12 @@
 // One whole frame of the chart (erase, star pass on all threads, foreground) for the real
-// catalogue and for synthetic universes of 100,000 and 1,000,000 systems, with 1 and 2 threads,
-// in the default view and in a view with every system in front of the camera.
+// catalogue and for synthetic universes of 100,000 and 1,000,000 systems, with 1 to 8 threads,
+// in the default view and in a view with every system in front of the camera, in the chart's
+// own window size and in a maximised one. Every frame benchmark also times the least work the
+// frame must do (LimitKernel.h) on the same view and reports it as limit_ms, and the frame's
+// ratio to it as over_limit: milliseconds move with the machine and the minute, the ratio
+// much less.
+#include "LimitKernel.h"
+
 #include "catalog/Universe.h"
 #include "chart/UniverseView.h"
 #include "core/Constants.h"
@@ -8,7 +14,9 @@
 #include "resources/ResourceData.h"
 
 #include <QApplication>
+#include <algorithm>
 #include <benchmark/benchmark.h>
+#include <chrono>
 #include <cmath>
 #include <map>
 #include <memory>
@@ -51,13 +59,39 @@ Universe* UniverseOf(int64_t which)
     return u.get();
 }
 
+// The chart's frame in milliseconds of the limit kernel on one thread: the median of several
+// runs over the view's data as it stands.
+double LimitMilliseconds(UniverseView& view)
+{
+    const BRect& frame = view.Frame();
+    const int32_t pitch = int32_t(frame.right) + 1;
+    std::vector<uint8_t> pixels(size_t(pitch) * size_t(frame.bottom + 1));
+    std::vector<double> runs;
+    int64_t visible = 0;
+    for (int run = 0; run < 9; run++) {
+        const auto start = std::chrono::steady_clock::now();
+        visible += LimitKernel(
+            view.PassData(), view.transform, view.focalLength, frame, pixels.data(), pitch);
+        runs.push_back(
+            std::chrono::duration<double, std::milli>(std::chrono::steady_clock::now() - start)
+                .count());
+    }
+    benchmark::DoNotOptimize(visible);
+    benchmark::DoNotOptimize(pixels.data());
+    std::nth_element(runs.begin(), runs.begin() + 4, runs.end());
+    return runs[4];
+}
+
 // range(0): 0 for the real catalogue, else a synthetic universe of that many systems;
 // range(1): threads; range(2): 0 the default view, 1 every system in front; range(3): 1 blocks
-// of systems for each thread, 0 single systems in turn.
+// of systems for each thread, 0 single systems in turn; range(4): the frame's width, 640 the
+// chart's own 640 x 480, 1920 a maximised 1920 x 1061.
 void BM_Frame(benchmark::State& state)
 {
     Universe* universe = UniverseOf(state.range(0));
-    UniverseView view(BRect(0, 0, 639, 479), "UniverseView", universe, int32_t(state.range(1)));
+    const bool big = state.range(4) == 1920;
+    UniverseView view(BRect(0, 0, big ? 1919 : 639, big ? 1060 : 479), "UniverseView", universe,
+        int32_t(state.range(1)));
     view.interleaveBlocks = state.range(3) != 0;
     view.InitOffscreen();
     if (state.range(2) == 1) {
@@ -71,20 +105,48 @@ void BM_Frame(benchmark::State& state)
     }
     view.HideGreaterThan(*view.GetDistanceFilter());
     view.CalculateLumCache();
+    const double limit = LimitMilliseconds(view);
+    const auto start = std::chrono::steady_clock::now();
     for (auto _ : state)
         view.Render();
+    const double frame
+        = std::chrono::duration<double, std::milli>(std::chrono::steady_clock::now() - start)
+              .count()
+        / double(std::max<benchmark::IterationCount>(state.iterations(), 1));
     state.counters["systems"] = double(universe->CountItems());
+    state.counters["limit_ms"] = limit;
+    state.counters["over_limit"] = frame / limit;
+}
+
+// The limit kernel alone over a million systems in the default view: systems a second.
+void BM_LimitKernel(benchmark::State& state)
+{
+    Universe* universe = UniverseOf(1000000);
+    UniverseView view(BRect(0, 0, 639, 479), "UniverseView", universe, 1);
+    view.InitOffscreen();
+    view.HideGreaterThan(*view.GetDistanceFilter());
+    std::vector<uint8_t> pixels(640 * 480);
+    for (auto _ : state) {
+        benchmark::DoNotOptimize(LimitKernel(
+            view.PassData(), view.transform, view.focalLength, view.Frame(), pixels.data(), 640));
+        benchmark::ClobberMemory();
+    }
+    state.SetItemsProcessed(state.iterations() * universe->CountItems());
 }
 
 } // namespace
 
 BENCHMARK(BM_Frame)
-    ->ArgNames({ "systems", "threads", "front", "blocks" })
-    ->ArgsProduct({ { 0, 100000, 1000000 }, { 1, 2 }, { 0, 1 }, { 1 } })
-    ->Args({ 1000000, 2, 0, 0 })
-    ->Args({ 1000000, 2, 1, 0 })
+    ->ArgNames({ "systems", "threads", "front", "blocks", "width" })
+    ->ArgsProduct({ { 0, 100000, 1000000 }, { 1, 2 }, { 0, 1 }, { 1 }, { 640 } })
+    ->ArgsProduct({ { 1000000 }, { 4, 8 }, { 0, 1 }, { 1 }, { 640 } })
+    ->ArgsProduct({ { 0, 1000000 }, { 1, 2 }, { 0 }, { 1 }, { 1920 } })
+    ->Args({ 1000000, 2, 0, 0, 640 })
+    ->Args({ 1000000, 2, 1, 0, 640 })
     ->Unit(benchmark::kMillisecond)
     ->UseRealTime();
+
+BENCHMARK(BM_LimitKernel)->Unit(benchmark::kMillisecond)->UseRealTime();
 
 int main(int argc, char** argv)
 {

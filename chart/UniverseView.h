@@ -33,6 +33,7 @@
 #include <QImage>
 #include <QPointer>
 #include <QTimer>
+#include <algorithm>
 #include <atomic>
 #include <functional>
 #include <memory>
@@ -131,6 +132,18 @@ public:
     QImage FrontImage() const;
     // The offscreen itself; only while renderLock is not contended (tests).
     RBitmap8* Offscreen() { return offscreen; }
+    // What the star pass reads of every system, for benchmarks that hold a frame against the
+    // least work it must do; valid while the view and its universe live.
+    struct StarPassData {
+        const double *x, *y, *z; // positions in parsecs
+        const uint8_t* shown; // the draw mask's states
+        int32_t count;
+    };
+    StarPassData PassData() const
+    {
+        return { fPositionX.data(), fPositionY.data(), fPositionZ.data(), drawMask->states,
+            std::min(int32_t(fPositionX.size()), drawMask->GetSystemCount()) };
+    }
     const BRect& Frame() const { return frame; }
     const char* DataString() const { return starInfo.IGetInfo(); }
     // Replaces the real drag (which runs until the button is let go) with a function that gets
