@@ -112,6 +112,18 @@ TEST(GaiaCatalogueTest, ProperMotionIsCarriedBackToJ2000)
     EXPECT_NEAR(stars[2].ra, Radians(200), 1e-3 / kRadian);
     EXPECT_NEAR(stars[2].dec, Radians(-45 - 16.0 / 3600), 1e-3 / kRadian);
 
+    // Just east of right ascension 0 and moving east at the pace that puts it a few 1e-16
+    // radians west of it at J2000: a whisker under a full turn, which must not round up to one.
+    GaiaTestStar whisker;
+    whisker.rawDirection = std::array<int32_t, 3> { 2000000000, 92513, 0 };
+    whisker.rawMotion = std::array<int32_t, 3> { 0, 596318, 0 };
+    GaiaTestFile atZero;
+    atZero.stars = { whisker };
+    const std::vector<ImportStar> nearZero = ReadStars(atZero);
+    ASSERT_EQ(nearZero.size(), 1u);
+    EXPECT_GE(nearZero[0].ra, 0);
+    EXPECT_LT(nearZero[0].ra, 2 * kPi);
+
     // A file of epoch J2000.0 needs no carrying back.
     file.epoch = 2451545.0f;
     const std::vector<ImportStar> atJ2000 = ReadStars(file);

@@ -22,6 +22,7 @@ struct GaiaTestStar {
     // Proper motion in microarcseconds a year: toward the east (along the right ascension,
     // already multiplied by the cosine of the declination) and toward the north.
     double motionEast = 0, motionNorth = 0;
+    std::optional<std::array<int32_t, 3>> rawMotion; // written instead, when set
     int16_t bv = 650; // millimagnitudes
     int16_t v = 5000; // millimagnitudes
     uint16_t parallax = 5000; // 0.02 mas: 100 mas
@@ -106,8 +107,9 @@ struct GaiaTestFile {
         }
         for (int k = 0; k < 3; k++) {
             Put(out,
-                static_cast<int32_t>(
-                    std::lround(star.motionEast * east[k] + star.motionNorth * north[k])));
+                star.rawMotion ? (*star.rawMotion)[static_cast<size_t>(k)]
+                               : static_cast<int32_t>(std::lround(
+                                   star.motionEast * east[k] + star.motionNorth * north[k])));
         }
         Put(out, star.bv);
         Put(out, star.v);

@@ -57,6 +57,14 @@ std::map<std::string, std::string> StarSeeds()
     star.spectralLine = 3;
     level1.stars.push_back(star);
     seeds["seed-level1"] = level1.Bytes();
+
+    // A right ascension that rounded up to a full turn.
+    GaiaTestFile whisker;
+    star = GaiaTestStar();
+    star.rawDirection = std::array<int32_t, 3> { 2000000000, 92513, 0 };
+    star.rawMotion = std::array<int32_t, 3> { 0, 596318, 0 };
+    whisker.stars.push_back(star);
+    seeds["repro-ra-full-turn"] = whisker.Bytes();
     return seeds;
 }
 

@@ -417,6 +417,10 @@ void ReadGaiaStars(std::string_view bytes, const std::string& file, const GaiaLa
         star.ra = std::atan2(d[1], d[0]);
         if (star.ra < 0)
             star.ra += 2 * kPI;
+        // A negative angle smaller than half the spacing of doubles near a turn rounds up to the
+        // turn itself.
+        if (star.ra >= 2 * kPI)
+            star.ra = 0;
         star.dec = std::asin(std::clamp(d[2] / n, -1.0, 1.0));
         star.parallax = r.parallax;
         star.gaiaId = r.sourceId;
