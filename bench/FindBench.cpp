@@ -40,14 +40,17 @@ struct Search {
     std::unique_ptr<StarQueryView> (*make)();
 };
 
-template <typename Panel> std::unique_ptr<Panel> NewPanel(const char* name)
+template <typename Panel>
+std::unique_ptr<Panel> NewPanel(const char* name, Universe* universe = &MillionSystems())
 {
-    return std::make_unique<Panel>(kPanelFrame, name, &MillionSystems(), nullptr);
+    return std::make_unique<Panel>(kPanelFrame, name, universe, nullptr);
 }
 
-std::unique_ptr<StarQueryView> NameSearch(int queryType, const char* text)
+// otherNames: over the universe whose stars go by other names too.
+std::unique_ptr<StarQueryView> NameSearch(int queryType, const char* text, bool otherNames = false)
 {
-    auto panel = NewPanel<NameQueryView>("Name Query");
+    auto panel = NewPanel<NameQueryView>(
+        "Name Query", otherNames ? &MillionSystemsWithOtherNames() : &MillionSystems());
     panel->queryType->SetMarked(queryType);
     panel->starName->SetText(text);
     return panel;
@@ -113,6 +116,12 @@ const Search kSearches[] = {
     { "Name/Contains", kStarArrayMessage, [] { return NameSearch(kNameContains, "2345"); } },
     // One system; its second star, if it has one, is "HIP 123456 B".
     { "Name/Is", kStarMessage, [] { return NameSearch(kNameIs, "HIP 123456"); } },
+    // The same where every star also goes by about 3.5 other names (Gaia DR3, Tycho, HD, GJ).
+    { "NameOther/StartsWith", kStarArrayMessage,
+        [] { return NameSearch(kNameStartsWith, "hip 4", true); } },
+    { "NameOther/Contains", kStarArrayMessage,
+        [] { return NameSearch(kNameContains, "2345", true); } },
+    { "NameOther/Is", kStarMessage, [] { return NameSearch(kNameIs, "HIP 123456", true); } },
     { "SC", kStarArrayMessage, SCSearch },
     { "MG", kStarArrayMessage, MGSearch },
     { "RA", kStarArrayMessage, RASearch },

@@ -14,7 +14,7 @@
 
 bool StarNames::Add(int32_t system, const char* name, size_t length)
 {
-    if (system < 0 || (!fEnd.empty() && size_t(system) + 1 < fEnd.size()))
+    if (system < 0 || length == 0 || (!fEnd.empty() && size_t(system) + 1 < fEnd.size()))
         return false;
     if (fText.size() + length + 1 > std::numeric_limits<uint32_t>::max())
         return false;

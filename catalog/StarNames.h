@@ -24,9 +24,10 @@ public:
         const char* end;
     };
 
-    // Adds name (length bytes, no NUL among them) to the names of system. Systems are filled in
-    // increasing order: a name for a system before the last one filled is refused, as is a name
-    // that would carry the arena past what 32-bit offsets reach. True when it was kept.
+    // Adds name (1 or more bytes, no NUL among them) to the names of system. Systems are filled
+    // in increasing order: a name for a system before the last one filled is refused, as are an
+    // empty name and a name that would carry the arena past what 32-bit offsets reach. True when
+    // it was kept.
     bool Add(int32_t system, const char* name, size_t length);
 
     // Gives back the room the arena and the offsets grew into beyond what they hold.
@@ -40,6 +41,9 @@ public:
         const char* text = fText.data();
         return { text + (system == 0 ? 0 : fEnd[system - 1]), text + fEnd[system] };
     }
+
+    // Every system's names, in system order.
+    Range All() const { return { fText.data(), fText.data() + fText.size() }; }
 
     bool Empty() const { return fText.empty(); }
     int64_t Count() const { return fCount; } // names held

@@ -3,6 +3,7 @@
 #pragma once
 
 #include "core/MessageCodes.h"
+#include "query/OtherNameSearch.h"
 #include "query/StarSysQuery.h"
 
 // Name modes.
@@ -43,13 +44,8 @@ private:
     bool Contains() const;
     bool StartsWith() const;
     void FillLowerTable(); // asks tolower, in the locale in force now, for every byte value
-    // The bytes a name may hold where the pattern starts: its first byte, and without regard to
-    // case every byte that lower-cases to it; none (0) when the pattern is empty or more than
-    // two bytes do.
-    void FindFirstBytes(bool caseSensitive);
 
     unsigned char lower[256]; // tolower of every byte value: made with the query, and again by
                               // each run without regard to case
-    unsigned char firstBytes[2] = {}; // as FindFirstBytes finds them for the run
-    int32_t firstByteCount = 0;
+    OtherNameSearch otherNameSearch; // through the universe's otherNames, for the run
 };

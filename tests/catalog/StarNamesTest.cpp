@@ -256,6 +256,7 @@ TEST(StarNames, SystemsAreFilledInOrder)
     EXPECT_TRUE(names.Add(5, "X", 1));
     EXPECT_FALSE(names.Add(4, "Y", 1));
     EXPECT_FALSE(names.Add(-1, "Y", 1));
+    EXPECT_FALSE(names.Add(5, "", 0));
     EXPECT_EQ(names.Count(), 3);
     EXPECT_EQ(names.Of(0).begin, names.Of(0).end);
     EXPECT_EQ(names.Of(3).begin, names.Of(3).end);

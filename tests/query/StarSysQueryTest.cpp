@@ -13,10 +13,13 @@
 
 #include <gtest/gtest.h>
 
+#include <cctype>
 #include <cmath>
 #include <cstddef>
 #include <cstring>
+#include <random>
 #include <set>
+#include <string>
 #include <vector>
 
 namespace {
@@ -297,6 +300,81 @@ TEST(StarSysQuery, NamesFindASystemByAnyOtherNameOfAnyOfItsStars)
     // The stars and systems keep their own names.
     EXPECT_STREQ(u.SystemAt(alpha)->GetName(), "Rigil Kentaurus");
     EXPECT_STREQ(u.SystemAt(proxima)->StarAt(0)->GetName(), "Proxima Centauri");
+}
+
+namespace {
+
+// The plain reading of the name tests on std::string: whether name passes mode's test for text.
+bool PlainNameTest(int32_t mode, std::string name, std::string text, bool caseSensitive)
+{
+    if (!caseSensitive) {
+        for (std::string* s : { &name, &text }) {
+            for (char& c : *s)
+                c = static_cast<char>(std::tolower(static_cast<unsigned char>(c)));
+        }
+    }
+    switch (mode) {
+    case kNameIs:
+        return name == text;
+    case kNameStartsWith:
+        return name.compare(0, text.size(), text) == 0;
+    case kNameContains:
+        return !name.empty() && name.find(text) != std::string::npos;
+    default:
+        return false;
+    }
+}
+
+} // namespace
+
+TEST(StarSysQuery, OtherNamesAreFoundAsThePlainTestsFindThem)
+{
+    // Short names from a few letters, digits and a blank, so that texts of up to three of them
+    // are found often, several times in one system and across the ends of names.
+    std::mt19937 random(26);
+    const char kLetters[] = "aAbB12 ";
+    const auto word = [&](size_t most) {
+        std::string w(random() % (most + 1), ' ');
+        for (char& c : w)
+            c = kLetters[random() % (sizeof kLetters - 1)];
+        return w;
+    };
+    Universe u(20);
+    std::vector<std::vector<std::string>> names; // every name of each system, its own first
+    for (int32_t i = 0; i < 300; i++) {
+        std::string own = word(4);
+        AddTestSystem(u, i, 0, 0, { { own.c_str(), "G2V", 4.83 } });
+        names.push_back({ own });
+        const int32_t others = random() % 4 == 0 ? 0 : int32_t(random() % 5);
+        for (int32_t k = 0; k < others; k++) {
+            std::string other = word(5);
+            if (!other.empty() && u.otherNames.Add(i, other.data(), other.size()))
+                names.back().push_back(other);
+        }
+    }
+    StarNameQuery query(&u);
+    for (int32_t round = 0; round < 400; round++) {
+        const std::string text = word(3);
+        const int32_t mode = round % 3;
+        const bool caseSensitive = round % 2 == 1;
+        std::set<int32_t> expected;
+        for (int32_t i = 0; i < u.CountItems(); i++) {
+            for (const std::string& name : names[size_t(i)]) {
+                if (PlainNameTest(mode, name, text, caseSensitive))
+                    expected.insert(i);
+            }
+        }
+        NameQueryParam param { mode, text.c_str(), caseSensitive };
+        ASSERT_EQ(Matches(query, &param), expected)
+            << mode << " '" << text << "' " << caseSensitive;
+        // Asked about system by system in the other order, and about every third system only.
+        for (int32_t i = u.CountItems() - 1; i >= 0; i--)
+            ASSERT_EQ(query.Query(i, &param), expected.count(i) == 1) << i << " '" << text << "'";
+        StarSysMask mask(u.CountItems(), true, 0);
+        query.GetSysMask(&mask, &param);
+        for (int32_t i = 0; i < u.CountItems(); i += 3)
+            ASSERT_EQ(query.Query(i, &param), expected.count(i) == 1) << i << " '" << text << "'";
+    }
 }
 
 TEST(StarSysQuery, NameQueryLowerCasesIntoItsOwnBuffers)
