@@ -3,8 +3,11 @@
 // with it while the program starts all the same.
 #include "NamedSky.h"
 
+#include "ViewMessages.h"
 #include "app/StartUniverse.h"
 #include "catalog/Star.h"
+#include "info/StarIView.h"
+#include "info/StarInfoScreen.h"
 #include "lists/ListWindow.h"
 #include "lists/StarListView.h"
 #include "query/panels/NameQueryView.h"
@@ -153,6 +156,31 @@ TEST_F(StarNamesStart, ASystemFoundByAnotherNameIsListedByItsOwn)
     EXPECT_EQ(list.listView->model()->index(0, 0).data().toString(), "Rigil Kentaurus");
     EXPECT_EQ(list.listView->model()->index(1, 0).data().toString(), "Proxima Centauri");
     EXPECT_STREQ(fUniverse->SystemAt(kAlpha)->StarAt(1)->GetName(), "Toliman");
+}
+
+TEST_F(StarNamesStart, ASystemFoundByAnotherNameShowsItsStarsOwnNamesInTheStarInformation)
+{
+    Write(fNames, NamesHeader() + kOtherNames);
+    Start();
+    NameQueryView panel(BRect(10, 10, 370, 60), "Name Query", fUniverse.get(), nullptr);
+    Type(panel.starName, "HIP 71681"); // alpha Centauri B's number
+    const std::optional<CaughtDrag> drag = PressHandle(&panel);
+    ASSERT_TRUE(drag.has_value());
+    ASSERT_EQ(drag->message.what, kStarMessage);
+
+    StarIView view(BPoint(0, 0), "Star Info View");
+    HandUniverse(view, fUniverse.get());
+    MessageMimeData data(drag->message);
+    const QPoint lower(100, StarIView::kHalfBoundary + 20);
+    QDragEnterEvent enter(lower, Qt::CopyAction, &data, Qt::LeftButton, Qt::NoModifier);
+    QCoreApplication::sendEvent(&view, &enter);
+    ASSERT_TRUE(enter.isAccepted());
+    QDropEvent drop(QPointF(lower), Qt::CopyAction, &data, Qt::LeftButton, Qt::NoModifier);
+    QCoreApplication::sendEvent(&view, &drop);
+    TypeAll(view);
+    EXPECT_EQ(view.Index1(), kAlpha);
+    EXPECT_EQ(ScreenText(view, 2, 4, 23), "Rigil Kentaurus");
+    EXPECT_EQ(ScreenText(view, 3, 4, 23), "Toliman");
 }
 
 TEST_F(StarNamesStart, NoNamesFileIsNothingToTell)
