@@ -55,7 +55,9 @@ ParsedCommandLine ParseCommandLine(const QStringList& arguments)
     const QCommandLineOption version({ "v", "version" }, "Show the version and exit.");
     const QCommandLineOption catalogue({ "c", "catalogue" },
         "Read the stars from FILE (the stars.dat format: two lines a star, the name, then "
-        "\"class absolute-magnitude x y z\" in parsecs).",
+        "\"class absolute-magnitude x y z\" in parsecs). The other names of its stars (HIP, "
+        "HD, GJ, Gaia DR3 ...), which the name query searches too, are read from the file of "
+        "the same name ending in .names beside it, when there is one.",
         "FILE");
     const QCommandLineOption generate({ "g", "generate" },
         "Show N random, unnamed systems instead of a catalogue (1 to 1000000), for "
