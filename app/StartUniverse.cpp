@@ -162,9 +162,68 @@ std::string Names(int64_t n)
     return std::to_string(n) + (n == 1 ? " name" : " names");
 }
 
-// The names file beside the catalogue at path read into universe, and what it met told: one
-// line of standard error for each kind of problem, the first on the help line unless the
-// catalogue had something to say there. No names file is nothing to tell.
+// The help line's text, unless something said earlier holds it.
+void HelpOnce(StartedUniverse* started, const std::string& before,
+    const std::filesystem::path& file, const std::string& after)
+{
+    if (started->helpLine.empty())
+        started->helpLine = HelpLine(before, file, after);
+}
+
+// What reading the names file at path (beside catalogue) met, one line of standard error for
+// each kind of problem and the first of them for the help line.
+void TellNameFlaws(const std::filesystem::path& path, const std::filesystem::path& catalogue,
+    const StarNamesReport& report, StartedUniverse* started)
+{
+    const std::string named = "nightdome: " + Quoted(path);
+    const std::string unused = "; the stars keep only their own names\n";
+    if (report.notNames) {
+        started->report += named + " is not a star names file (its first line is not '"
+            + kStarNamesMagic + "' with the catalogue's star count and size below it)" + unused;
+        HelpOnce(started, "", path, " is not a star names file");
+        return;
+    }
+    if (report.stale) {
+        started->report += named + " is stale: it is for a catalogue of "
+            + std::to_string(report.namedStars) + " stars and " + std::to_string(report.namedBytes)
+            + " bytes, " + Quoted(catalogue) + " holds " + std::to_string(report.stars)
+            + " stars in " + std::to_string(report.bytes) + " bytes" + unused;
+        HelpOnce(started, "", path, " is stale: names not used");
+        return;
+    }
+    const auto at = [](int64_t line) { return ", line " + std::to_string(line) + ": "; };
+    if (report.badLines > 0) {
+        const std::string kCauses[][2] = {
+            { "a star index that is not a number", "bad star index" },
+            { "a star index beyond the catalogue's stars", "no such star" },
+            { "a star index not after the one of the line before", "out of order" },
+            { "a star index without names", "no names" },
+            { "a line longer than " + std::to_string(kMaxNamesLine) + " characters",
+                "line too long" },
+        };
+        const std::string* cause = kCauses[report.cause];
+        const std::string lines
+            = std::to_string(report.badLines) + (report.badLines == 1 ? " line" : " lines");
+        started->report
+            += named + at(report.badLinesLine) + cause[0] + "; " + lines + " passed over\n";
+        HelpOnce(started, "", path, at(report.badLinesLine) + cause[1] + "; " + lines + " bad");
+    }
+    if (report.badNames > 0) {
+        started->report += named + at(report.badNamesLine)
+            + "a name empty, longer than 79 characters or not printable ASCII; "
+            + Names(report.badNames) + " passed over\n";
+        HelpOnce(started, "", path,
+            at(report.badNamesLine) + "bad name; " + Names(report.badNames) + " bad");
+    }
+    if (report.dropped > 0) {
+        started->report += named + ": more names than the program holds (4 GiB); "
+            + Names(report.dropped) + " passed over\n";
+        HelpOnce(started, "", path, ": too many names; " + Names(report.dropped) + " not kept");
+    }
+}
+
+// The names file beside the catalogue read into the started universe, and what it met told.
+// No names file is nothing to tell.
 void ReadNamesBeside(const std::filesystem::path& catalogue, bool cut, StartedUniverse* started)
 {
     std::filesystem::path path = catalogue;
@@ -172,16 +231,10 @@ void ReadNamesBeside(const std::filesystem::path& catalogue, bool cut, StartedUn
     std::error_code error;
     if (!std::filesystem::exists(path, error))
         return;
-    const std::string named = "nightdome: " + Quoted(path);
-    const std::string plain = "; the stars keep only their own names\n";
-    const auto help = [&path, &started](const std::string& before, const std::string& after) {
-        if (started->helpLine.empty())
-            started->helpLine = HelpLine(before, path, after);
-    };
-    const auto cannot = [&](const std::string& reason) {
-        started->report
-            += "nightdome: cannot read the star names " + Quoted(path) + ": " + reason + plain;
-        help("Cannot read ", ": " + reason);
+    const auto cannot = [&path, &started](const std::string& reason) {
+        started->report += "nightdome: cannot read the star names " + Quoted(path) + ": " + reason
+            + "; the stars keep only their own names\n";
+        HelpOnce(started, "Cannot read ", path, ": " + reason);
     };
     if (std::filesystem::is_directory(path, error))
         return cannot("it is a folder");
@@ -196,51 +249,7 @@ void ReadNamesBeside(const std::filesystem::path& catalogue, bool cut, StartedUn
         started->universe->otherNames.Clear();
         return cannot(std::string("reading failed: ") + std::strerror(errno));
     }
-    if (report.notNames) {
-        started->report += named + " is not a star names file (its first line is not '"
-            + kStarNamesMagic + "' with the catalogue's star count and size below it)" + plain;
-        help("", " is not a star names file");
-        return;
-    }
-    if (report.stale) {
-        started->report += named + " is stale: it is for a catalogue of "
-            + std::to_string(report.namedStars) + " stars and " + std::to_string(report.namedBytes)
-            + " bytes, " + Quoted(catalogue) + " holds " + std::to_string(report.stars)
-            + " stars in " + std::to_string(report.bytes) + " bytes" + plain;
-        help("", " is stale: names not used");
-        return;
-    }
-    const auto at
-        = [&named](int64_t line) { return named + ", line " + std::to_string(line) + ": "; };
-    if (report.badLines > 0) {
-        static const char* const kCauses[][2] = {
-            { "a star index that is not a number", "bad star index" },
-            { "a star index beyond the catalogue's stars", "no such star" },
-            { "a star index not after the one of the line before", "out of order" },
-            { "a star index without names", "no names" },
-            { "a line longer than 65536 characters", "line too long" },
-        };
-        const char* const* cause = kCauses[report.cause];
-        const std::string lines
-            = std::to_string(report.badLines) + (report.badLines == 1 ? " line" : " lines");
-        started->report += at(report.badLinesLine) + cause[0] + "; " + lines + " passed over\n";
-        help("",
-            ", line " + std::to_string(report.badLinesLine) + ": " + cause[1] + "; " + lines
-                + " bad");
-    }
-    if (report.badNames > 0) {
-        started->report += at(report.badNamesLine)
-            + "a name empty, longer than 79 characters or not printable ASCII; "
-            + Names(report.badNames) + " passed over\n";
-        help("",
-            ", line " + std::to_string(report.badNamesLine) + ": bad name; "
-                + Names(report.badNames) + " bad");
-    }
-    if (report.dropped > 0) {
-        started->report += named + ": more names than the program holds (4 GiB); "
-            + Names(report.dropped) + " passed over\n";
-        help("", ": too many names; " + Names(report.dropped) + " not kept");
-    }
+    TellNameFlaws(path, catalogue, report, started);
 }
 
 } // namespace
