@@ -1,6 +1,8 @@
 // Built like the star pass it is the limit of: -O3, fused multiply-adds only where it fuses them.
 #include "LimitKernel.h"
 
+#include "core/VectorClones.h"
+
 #include <algorithm>
 #include <bit>
 #include <cmath>
@@ -15,10 +17,9 @@ constexpr int32_t kChunk = 256;
 // the first call picks the one the processor runs best. The flags may round as they like (a
 // pixel of margin), so products are fused there; the projection of the few flagged rounds as
 // the rule does.
-__attribute__((target_clones("arch=x86-64-v3", "default"), optimize("fp-contract=fast"))) void Flag(
-    const double* __restrict x, const double* __restrict y, const double* __restrict z,
-    const uint8_t* __restrict shown, int32_t n, const SMatrix& transform, double reachX,
-    double reachY, uint8_t* __restrict near)
+ND_VECTOR_CLONES __attribute__((optimize("fp-contract=fast"))) void Flag(const double* __restrict x,
+    const double* __restrict y, const double* __restrict z, const uint8_t* __restrict shown,
+    int32_t n, const SMatrix& transform, double reachX, double reachY, uint8_t* __restrict near)
 {
     const auto& m = transform.m;
     const double m00 = m[0][0], m01 = m[0][1], m02 = m[0][2], m03 = m[0][3];

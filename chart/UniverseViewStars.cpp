@@ -4,6 +4,7 @@
 #include "chart/UniverseView.h"
 
 #include "core/Truncate.h"
+#include "core/VectorClones.h"
 
 #include <algorithm>
 #include <bit>
@@ -57,9 +58,9 @@ __attribute__((optimize("fp-contract=fast"))) inline void Flag(const double* __r
 
 // Flags n consecutive systems from index first on: one version for processors with AVX2 and
 // FMA (four doubles a step), one for any x86-64 (two).
-__attribute__((target_clones("arch=x86-64-v3", "default"), optimize("fp-contract=fast"))) void
-FlagChunk(const double* px, const double* py, const double* pz, const uint8_t* shown, int32_t first,
-    int32_t n, const Camera& c, uint8_t* near)
+ND_VECTOR_CLONES __attribute__((optimize("fp-contract=fast"))) void FlagChunk(const double* px,
+    const double* py, const double* pz, const uint8_t* shown, int32_t first, int32_t n,
+    const Camera& c, uint8_t* near)
 {
     Flag(px + first, py + first, pz + first, shown + first, n, c, near);
 }
