@@ -2,7 +2,6 @@
 #include "chart/UniverseView.h"
 
 #include "core/MessageCodes.h"
-#include "platform/qt/BitmapImage.h"
 #include "platform/qt/MessageDrag.h"
 #include "widgets/WidgetGeometry.h"
 
@@ -57,7 +56,6 @@ UniverseView::UniverseView(
     fViewWidth = width();
     fViewHeight = height();
 
-    fSelf = this;
     fPressTimer.setInterval(50);
     connect(&fPressTimer, &QTimer::timeout, this, [this] { SamplePress(); });
 }
@@ -112,25 +110,8 @@ void UniverseView::paintEvent(QPaintEvent*)
     // paint those).
     if (!window()->isMinimized())
         Resume();
-    // The render thread holds the hand-over lock for a copy at most; if it is busy, its next
-    // frame asks for another paint anyway.
-    std::unique_lock lock(fHandOver, std::try_to_lock);
-    if (!lock.owns_lock() || fFront.empty())
-        return;
-    // The palette look-up is done here, on this thread: handed an indexed image, Qt converts
-    // large ones on its own worker threads.
-    if (fShown.width() != fFrontWidth || fShown.height() != fFrontHeight)
-        fShown = QImage(fFrontWidth, fFrontHeight, QImage::Format_RGB32);
-    const QRgb* palette = SystemColorTable().constData();
-    for (int32_t y = 0; y < fFrontHeight; y++) {
-        const uint8_t* from = fFront.data() + size_t(y) * size_t(fFrontPitch);
-        auto* to = reinterpret_cast<QRgb*>(fShown.scanLine(y));
-        for (int32_t x = 0; x < fFrontWidth; x++)
-            to[x] = palette[from[x]];
-    }
-    lock.unlock();
     QPainter painter(this);
-    painter.drawImage(QPoint(0, 0), fShown);
+    fFrames.Paint(painter);
 }
 
 void UniverseView::resizeEvent(QResizeEvent*)
@@ -138,16 +119,6 @@ void UniverseView::resizeEvent(QResizeEvent*)
     fViewWidth = width();
     fViewHeight = height();
     frameResized = true;
-}
-
-QImage UniverseView::FrontImage() const
-{
-    std::lock_guard lock(fHandOver);
-    if (fFront.empty())
-        return {};
-    QImage image(fFront.data(), fFrontWidth, fFrontHeight, fFrontPitch, QImage::Format_Indexed8);
-    image.setColorTable(SystemColorTable());
-    return image.copy();
 }
 
 void UniverseView::dragEnterEvent(QDragEnterEvent* event)

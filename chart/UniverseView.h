@@ -10,8 +10,8 @@
 // mouse controls write (velocities, brightness, contrast, clipping radius) are relaxed atomics
 // read once per frame without a lock; so are the mouse position and the hover fields that the
 // workers update concurrently (a race there may leave a slightly farther system as target for
-// one frame). A finished frame is copied to a front buffer under a hand-over lock and painted by
-// the GUI thread; a frame that cannot get that lock within 0.1 s is not shown.
+// one frame). A finished frame is handed to the GUI thread through a FrameHandOver, which paints
+// the newest one; a frame that cannot get its lock within 0.1 s is not shown.
 #pragma once
 
 #include "catalog/Universe.h"
@@ -22,7 +22,7 @@
 #include "platform/BPoint.h"
 #include "platform/BRect.h"
 #include "platform/ThreadPark.h"
-#include "platform/TimedLock.h"
+#include "platform/qt/FrameHandOver.h"
 #include "platform/qt/Messaging.h"
 #include "platform/qt/TransitView.h"
 #include "query/StarSysMask.h"
@@ -31,7 +31,6 @@
 #include "widgets/IBroadcaster.h"
 
 #include <QImage>
-#include <QPointer>
 #include <QTimer>
 #include <algorithm>
 #include <atomic>
@@ -129,7 +128,9 @@ public:
     void MessageReceived(Message* message) override;
 
     // The finished frame as the view paints it (a copy), for tests and screenshots.
-    QImage FrontImage() const;
+    QImage FrontImage() const { return fFrames.FrontImage(); }
+    // Where finished frames are handed to the GUI thread; tests hold its lock.
+    FrameHandOver& Frames() { return fFrames; }
     // The offscreen itself; only while renderLock is not contended (tests).
     RBitmap8* Offscreen() { return offscreen; }
     // What the star pass reads of every system, for benchmarks that hold a frame against the
@@ -274,12 +275,7 @@ private:
     // three arrays costs far less than visiting a million heap objects every frame.
     std::vector<double> fPositionX, fPositionY, fPositionZ; // parsecs
     std::vector<const ColorTable*> fTables; // not owned
-    mutable TimedLock fHandOver; // guards fFront and its size
-    std::vector<uint8_t> fFront; // the last frame shown: rows of fFrontPitch bytes
-    std::atomic<bool> fUpdatePending { false }; // a paint is asked for and not yet done
-    QPointer<UniverseView> fSelf; // made on the interface thread, copied by the render thread
-    QImage fShown; // the front buffer in colour, as painted; the interface thread's own
-    int32_t fFrontWidth = 0, fFrontHeight = 0, fFrontPitch = 0;
+    FrameHandOver fFrames { this }; // finished frames on their way to the GUI thread
     // A press in progress: the target it began on and where, sampled every 50 ms.
     QTimer fPressTimer;
     int32_t fPressTarget = -1;

@@ -3,7 +3,6 @@
 #include "chart/UniverseView.h"
 
 #include "platform/Kernel.h"
-#include "platform/qt/ThreadMailbox.h"
 
 #include <chrono>
 #include <pthread.h>
@@ -170,32 +169,14 @@ void UniverseView::RenderLoop(int32_t index)
 
 void UniverseView::Blit()
 {
-    // A frame that cannot be handed over within 0.1 s is not shown.
-    if (!fHandOver.try_lock_for(std::chrono::milliseconds(100)))
+    // A frame that cannot be handed over within 0.1 s is not shown, and a resize waits for a
+    // frame that is; so does it while a late worker may still draw into the offscreen.
+    if (!fFrames.HandOver(*offscreen) || fSharesMissing || !frameResized.exchange(false))
         return;
-    fFrontWidth = offscreen->Width();
-    fFrontHeight = offscreen->Height();
-    fFrontPitch = offscreen->BytesPerRow();
-    fFront.assign(offscreen->Bits(), offscreen->Bits() + offscreen->BitsLength());
-    // A late worker may still draw into the offscreen: then the resize waits for a later frame.
-    const bool resized = !fSharesMissing && frameResized.exchange(false);
-    fHandOver.unlock();
-    // One paint request at a time; the interface thread asks for the next frame when it paints.
-    if (!fUpdatePending.exchange(true)) {
-        ThreadMailbox::Instance().Post([view = fSelf] {
-            if (view) {
-                view->fUpdatePending = false;
-                view->update();
-            }
-        });
-    }
-
     // A resize takes effect after a frame was shown: until then the old offscreen is drawn.
-    if (resized) {
-        renderLock->Acquire();
-        ReplaceOffscreen();
-        renderLock->Release();
-    }
+    renderLock->Acquire();
+    ReplaceOffscreen();
+    renderLock->Release();
 }
 
 void UniverseView::MainRenderLoop()

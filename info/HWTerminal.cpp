@@ -18,7 +18,6 @@ HWTerminal::HWTerminal(BRect frame, const char* name, int32_t cols, int32_t rows
     , cols(cols)
     , rows(rows)
     , cellCount(cols * rows)
-    , fSelf(this)
 {
     PlaceWidget(this, frame, name);
     SetCPS(20);

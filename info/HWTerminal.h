@@ -20,21 +20,20 @@
 //   SetCharacterColors and friends may be called from the GUI thread while the thread runs. It is
 //   recursive because a subclass's RenderBackground runs under it and may call the setters and
 //   accessors itself. Order: fRenderLock before fCommandLock, never the other way.
-// - fHandOver guards the front buffer: the thread copies a finished frame into it (giving up on
-//   that frame after 0.1 s), the GUI thread converts it to colour in paintEvent.
+// - fFrames hands finished frames to the GUI thread (giving up on a frame whose hand-over waits
+//   for more than 0.1 s); the GUI thread paints the newest one.
 // - The delays, followLength, `done` and `running` are relaxed atomics read without a lock.
 #pragma once
 
 #include "platform/BRect.h"
 #include "platform/Kernel.h"
 #include "platform/ThreadPark.h"
-#include "platform/TimedLock.h"
+#include "platform/qt/FrameHandOver.h"
 #include "render/ColorTypes.h"
 #include "render/RBMFont8.h"
 #include "render/RBitmap8.h"
 
 #include <QImage>
-#include <QPointer>
 #include <QWidget>
 #include <atomic>
 #include <condition_variable>
@@ -151,9 +150,11 @@ public:
     // Processor time the terminal thread has used so far (microseconds), or -1 when none runs.
     bigtime_t ThreadCPUTime() const;
     // Frames the thread has handed to the GUI thread since it started.
-    int64_t FramesShown() const { return fFramesShown.load(); }
+    int64_t FramesShown() const { return fFrames.FramesHandedOver(); }
     // The last frame handed over, as painted (a copy); null before the first.
-    QImage FrontImage() const;
+    QImage FrontImage() const { return fFrames.FrontImage(); }
+    // Where finished frames are handed to the GUI thread; tests hold its lock.
+    FrameHandOver& Frames() { return fFrames; }
     // The lock the terminal thread renders under, for subclasses whose RenderBackground reads
     // state of their own that the GUI thread changes.
     std::recursive_mutex& RenderLock() const { return fRenderLock; }
@@ -174,8 +175,6 @@ private:
     bool Execute(uint8_t byte);
     void PrintCell(uint8_t byte);
     uint8_t IndexOf(rgb_color color) const;
-    // Copies the bitmap to the front buffer and asks the GUI thread for a paint.
-    void HandOver();
     // Sleeps for up to microseconds, ending early when the thread is told to stop.
     void Nap(bigtime_t microseconds);
 
@@ -217,10 +216,5 @@ private:
     std::function<void(bigtime_t)> fPauseHook;
     bool fShownOnce = false;
 
-    mutable TimedLock fHandOver; // guards fFront
-    std::vector<uint8_t> fFront; // the last frame handed over, rows of the bitmap's pitch
-    std::atomic<bool> fUpdatePending { false }; // a paint is asked for and not yet done
-    QPointer<HWTerminal> fSelf; // made on the GUI thread, copied by the terminal thread
-    QImage fShown; // the front buffer in colour; the GUI thread's own
-    std::atomic<int64_t> fFramesShown { 0 };
+    FrameHandOver fFrames { this }; // finished frames on their way to the GUI thread
 };

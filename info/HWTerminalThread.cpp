@@ -2,9 +2,6 @@
 // frames on the GUI thread.
 #include "info/HWTerminal.h"
 
-#include "platform/qt/BitmapImage.h"
-#include "platform/qt/ThreadMailbox.h"
-
 #include <QPainter>
 #include <QShowEvent>
 #include <chrono>
@@ -80,7 +77,7 @@ int32_t HWTerminal::TerminalLoop()
         if (changed) {
             std::lock_guard lock(fRenderLock);
             RenderTerminal();
-            HandOver();
+            fFrames.HandOver(*bitmap);
         }
 
         const bigtime_t elapsed = system_time() - start;
@@ -103,25 +100,6 @@ void HWTerminal::Nap(bigtime_t microseconds)
     fNapEnd.wait_for(lock, std::chrono::microseconds(microseconds), [&] { return !running; });
 }
 
-void HWTerminal::HandOver()
-{
-    // A frame that cannot be handed over within 0.1 s is not shown.
-    if (!fHandOver.try_lock_for(std::chrono::milliseconds(100)))
-        return;
-    fFront.assign(bitmap->Bits(), bitmap->Bits() + bitmap->BitsLength());
-    fHandOver.unlock();
-    fFramesShown++;
-    // One paint request at a time; the GUI thread asks for the next frame when it paints.
-    if (!fUpdatePending.exchange(true)) {
-        ThreadMailbox::Instance().Post([view = fSelf] {
-            if (view) {
-                view->fUpdatePending = false;
-                view->update();
-            }
-        });
-    }
-}
-
 bigtime_t HWTerminal::ThreadCPUTime() const
 {
     if (!thread.joinable())
@@ -132,17 +110,6 @@ bigtime_t HWTerminal::ThreadCPUTime() const
         || clock_gettime(clock, &used) != 0)
         return -1;
     return bigtime_t(used.tv_sec) * 1000000 + used.tv_nsec / 1000;
-}
-
-QImage HWTerminal::FrontImage() const
-{
-    std::lock_guard lock(fHandOver);
-    if (fFront.empty())
-        return {};
-    QImage image(fFront.data(), bitmap->Width(), bitmap->Height(), bitmap->BytesPerRow(),
-        QImage::Format_Indexed8);
-    image.setColorTable(SystemColorTable());
-    return image.copy();
 }
 
 void HWTerminal::showEvent(QShowEvent* event)
@@ -157,30 +124,6 @@ void HWTerminal::showEvent(QShowEvent* event)
 void HWTerminal::paintEvent(QPaintEvent*)
 {
     QPainter painter(this);
-    // The terminal thread holds the hand-over lock for a copy at most; if it is busy, its next
-    // frame asks for another paint anyway.
-    std::unique_lock lock(fHandOver, std::try_to_lock);
-    if (!lock.owns_lock())
-        return;
-    if (fFront.empty()) {
-        lock.unlock();
+    if (!fFrames.Paint(painter))
         painter.fillRect(rect(), Qt::black);
-        return;
-    }
-    // The palette look-up is done here, on this thread: handed an indexed image, Qt may convert
-    // it on its own worker threads.
-    const int32_t width = bitmap->Width();
-    const int32_t height = bitmap->Height();
-    const int32_t pitch = bitmap->BytesPerRow();
-    if (fShown.width() != width || fShown.height() != height)
-        fShown = QImage(width, height, QImage::Format_RGB32);
-    const QRgb* palette = SystemColorTable().constData();
-    for (int32_t y = 0; y < height; y++) {
-        const uint8_t* from = fFront.data() + size_t(y) * size_t(pitch);
-        auto* to = reinterpret_cast<QRgb*>(fShown.scanLine(y));
-        for (int32_t x = 0; x < width; x++)
-            to[x] = palette[from[x]];
-    }
-    lock.unlock();
-    painter.drawImage(QPoint(0, 0), fShown);
 }

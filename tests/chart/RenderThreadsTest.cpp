@@ -1,5 +1,6 @@
 // The frame loop on its threads: workers, pausing, resizing and stopping.
 #include "ChartFixture.h"
+#include "ShownPixels.h"
 #include "ThreadNames.h"
 
 #include <QTest>
@@ -21,8 +22,11 @@ bool WaitForFrames(UniverseView* view, int64_t frames)
 
 class UniverseViewTest : public ChartTest {
 protected:
-    static TimedLock& HandOver(UniverseView* view) { return view->fHandOver; }
-    static int32_t FrontWidth(UniverseView* view) { return view->fFrontWidth; }
+    static TimedLock& HandOver(UniverseView* view) { return view->Frames().Lock(); }
+    static int32_t FrontWidth(UniverseView* view)
+    {
+        return view->Frames().FrontImageUnderLock().width();
+    }
 };
 
 TEST_F(UniverseViewTest, OneThreadDrawsEverySystemWithoutWorkers)
@@ -166,4 +170,27 @@ TEST_F(UniverseViewTest, AResizeShowsOnlyAfterAFrameIsHandedOver)
     view->DetachedFromWindow();
     EXPECT_EQ(view->Frame().right, 59);
     EXPECT_EQ(view->Frame().bottom, 49);
+}
+
+TEST_F(UniverseViewTest, AStillChartIsPaintedThoughItsPaintFoundTheHandOverBusy)
+{
+    Universe* u = MakeUniverse({ { "Sol", 0, 0, 0, 4.7 } });
+    UniverseView* view = MakeView(u);
+    // One frame, then the loop waits an hour for the next: nothing more is handed over.
+    view->SetFramePeriod(3600000000);
+    view->show();
+    ASSERT_TRUE(QTest::qWaitForWindowExposed(view));
+    view->AttachedToWindow();
+    ASSERT_TRUE(WaitForFrames(view, 1));
+    const QImage frame = view->FrontImage().convertToFormat(QImage::Format_RGB32);
+    ASSERT_TRUE(QTest::qWaitFor([&] { return ShownPixels(view) == frame; }, 10000));
+
+    {
+        // The window is uncovered while the hand-over lock is held.
+        std::lock_guard hold(view->Frames().Lock());
+        view->repaint();
+    }
+    EXPECT_TRUE(QTest::qWaitFor([&] { return ShownPixels(view) == frame; }, 10000));
+    EXPECT_EQ(view->FramesRendered(), 1);
+    view->DetachedFromWindow();
 }

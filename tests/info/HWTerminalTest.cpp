@@ -10,6 +10,8 @@
 #include "render/SystemPalette.h"
 #include "resources/ResourceData.h"
 
+#include "ShownPixels.h"
+
 #include <QTest>
 #include <chrono>
 #include <cstdio>
@@ -673,6 +675,28 @@ TEST_F(HWTerminalThreadTest, TypesTextIntoTheGridAndEndsWhenDetached)
     EXPECT_EQ(terminal->PendingBytes(), 6);
     terminal->AttachedToWindow();
     ASSERT_TRUE(WaitFor([&] { return Row(0, 0, 25) == "typed by the thread again"; }));
+}
+
+TEST_F(HWTerminalThreadTest, AnIdleTerminalIsPaintedThoughItsPaintFoundTheHandOverBusy)
+{
+    terminal->HWTPrintString("idle now");
+    terminal->show(); // starts the thread
+    ASSERT_TRUE(QTest::qWaitForWindowExposed(terminal.get()));
+    ASSERT_TRUE(WaitFor([&] { return terminal->IsSuspended() && terminal->HWTIsDone(); }));
+    const QImage frame = terminal->FrontImage().convertToFormat(QImage::Format_RGB32);
+    ASSERT_TRUE(WaitFor([&] { return ShownPixels(terminal.get()) == frame; }));
+    const int64_t frames = terminal->FramesShown();
+
+    {
+        // The window is uncovered while the hand-over lock is held (by a reader of the front
+        // image, say).
+        std::lock_guard hold(terminal->Frames().Lock());
+        terminal->repaint();
+    }
+    // The idle terminal hands over nothing more, and shows its text all the same.
+    EXPECT_TRUE(WaitFor([&] { return ShownPixels(terminal.get()) == frame; }));
+    EXPECT_EQ(terminal->FramesShown(), frames);
+    EXPECT_TRUE(terminal->IsSuspended());
 }
 
 TEST_F(HWTerminalThreadTest, IdleThreadIsSuspendedDoneAndWokenByEveryAppend)
