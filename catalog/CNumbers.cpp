@@ -2,9 +2,11 @@
 #include "catalog/CNumbers.h"
 
 #include <algorithm>
+#include <bit>
 #include <charconv>
 #include <clocale>
 #include <cstdarg>
+#include <cstdint>
 #include <cstdio>
 #include <cstring>
 #include <locale.h>
@@ -13,7 +15,7 @@ namespace {
 
 bool IsDigit(char c)
 {
-    return c >= '0' && c <= '9';
+    return static_cast<unsigned char>(c - '0') < 10;
 }
 
 // A plain decimal in [p, end), one from_chars reads the way strtod does: an optional minus,
@@ -46,7 +48,84 @@ private:
     locale_t fPrevious;
 };
 
+// The powers of ten that a double holds exactly.
+constexpr double kExactPowersOfTen[] = { 1e0, 1e1, 1e2, 1e3, 1e4, 1e5, 1e6, 1e7, 1e8, 1e9, 1e10,
+    1e11, 1e12, 1e13, 1e14, 1e15, 1e16, 1e17, 1e18, 1e19, 1e20, 1e21, 1e22 };
+constexpr size_t kMaxExactScale = 22;
+// Integers up to 2^53 are exact in a double.
+constexpr uint64_t kMaxExactMantissa = uint64_t(1) << 53;
+constexpr size_t kMaxDigits = 19;
+
 } // namespace
+
+namespace {
+
+// Appends the run of digits at *p, moving *p past it, to *mantissa (wrapping when there are
+// more than nineteen, which the caller then refuses); returns how many there were. Eight
+// characters at a time while eight remain before end: a digit's high nibble is 3 and adding 6
+// keeps it 3, so a byte that fails either test ends the run; the digits found are then
+// combined pairwise, as two-, four- and eight-digit numbers.
+size_t TakeDigits(const char** p, const char* end, uint64_t* mantissa)
+{
+    constexpr uint64_t kHigh = 0xF0F0F0F0F0F0F0F0u, kThrees = 0x3030303030303030u;
+    constexpr uint64_t kPowers[]
+        = { 1, 10, 100, 1000, 10000, 100000, 1000000, 10000000, 100000000 };
+    const char* q = *p;
+    while (end - q >= 8) {
+        uint64_t word;
+        std::memcpy(&word, q, sizeof word);
+        const uint64_t other
+            = ((word & kHigh) ^ kThrees) | (((word + 0x0606060606060606u) & kHigh) ^ kThrees);
+        const int run = other ? std::countr_zero(other) / 8 : 8;
+        if (run > 0) {
+            uint64_t digits = (word & 0x0F0F0F0F0F0F0F0Fu) << (8 * (8 - run));
+            digits = (digits * 10 + (digits >> 8)) & 0x00FF00FF00FF00FFu;
+            digits = (digits * 100 + (digits >> 16)) & 0x0000FFFF0000FFFFu;
+            digits = (digits * 10000 + (digits >> 32)) & 0xFFFFFFFFu;
+            *mantissa = *mantissa * kPowers[run] + digits;
+            q += run;
+        }
+        if (run < 8) {
+            const size_t taken = q - *p;
+            *p = q;
+            return taken;
+        }
+    }
+    while (q < end && IsDigit(*q))
+        *mantissa = *mantissa * 10 + static_cast<uint64_t>(*q++ - '0');
+    const size_t taken = q - *p;
+    *p = q;
+    return taken;
+}
+
+} // namespace
+
+const char* ScanPlainDecimal(const char* p, const char* end, double* value)
+{
+    const bool negative = p < end && *p == '-';
+    p += negative;
+    // Leading zeros count as digits, which only sends a few more numbers to the general
+    // readers.
+    uint64_t mantissa = 0;
+    const char* q = p;
+    const size_t integerDigits = TakeDigits(&q, end, &mantissa);
+    size_t scale = 0; // digits after the point
+    if (q < end && *q == '.') {
+        q++;
+        scale = TakeDigits(&q, end, &mantissa);
+    }
+    const size_t digits = integerDigits + scale;
+    if (digits == 0 || digits > kMaxDigits || scale > kMaxExactScale
+        || mantissa > kMaxExactMantissa)
+        return nullptr;
+    if (q < end && *q != '\0' && !IsCSpace(*q))
+        return nullptr;
+    // Both operands are exact, so the one rounding of the division is the correctly rounded
+    // value of the decimal, which is what strtod returns.
+    const double magnitude = static_cast<double>(mantissa) / kExactPowersOfTen[scale];
+    *value = negative ? -magnitude : magnitude;
+    return q;
+}
 
 bool ScanDouble(const char* text, double* value, const char** next)
 {
@@ -105,11 +184,16 @@ int ScanCatalogueData(const char* line, const char* end, char* classText, double
     for (int i = 0; fast && i < 4; i++) {
         while (p < end && IsCSpace(*p))
             p++;
-        if (!LooksDecimal(p, end))
-            break;
-        const auto [after, error] = std::from_chars(p, end, values[i]);
-        fast = error == std::errc() && (after == end || IsCSpace(*after));
-        p = after;
+        if (const char* after = ScanPlainDecimal(p, end, &values[i]);
+            after && (after == end || IsCSpace(*after))) {
+            p = after;
+        } else {
+            if (!LooksDecimal(p, end))
+                break;
+            const auto [next, error] = std::from_chars(p, end, values[i]);
+            fast = error == std::errc() && (next == end || IsCSpace(*next));
+            p = next;
+        }
         if (fast && i == 3) {
             std::memcpy(classText, word, wordEnd - word);
             classText[wordEnd - word] = '\0';

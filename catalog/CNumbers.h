@@ -27,6 +27,14 @@ int FormatDouble(char* buffer, size_t size, const char* format, double value);
 int FormatCLocale(char* buffer, size_t size, const char* format, ...)
     __attribute__((format(printf, 3, 4)));
 
+// A plain decimal as catalogues are written ("%.3f", "%.6f": an optional minus, digits, a
+// point, digits) read from [p, end), giving bit for bit what strtod gives, at a fraction of
+// its cost. Returns where the number ends, or null when the text there is anything else (a
+// sign other than minus, an exponent, hexadecimal, inf, nan, no digit at all, a number that
+// does not end at end, a blank or a NUL) or holds more digits than this exact path takes: the
+// general readers handle those.
+const char* ScanPlainDecimal(const char* p, const char* end, double* value);
+
 // The fields of a catalogue data line, as sscanf(line, "%s %lf %lf %lf %lf") would fill them.
 // classText must hold 501 bytes; line is NUL-terminated or ends at end, whichever comes first,
 // and is at most 500 characters long. Fields that are not read keep their values. Returns

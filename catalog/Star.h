@@ -15,7 +15,9 @@ inline double SolarLuminosity(double absoluteMagnitude)
 
 class Star : public GravSystem {
 public:
-    Star(const char* name, const char* spectralClassText, double magnitude, int32_t blockSize);
+    Star(GravName name, const char* spectralClassText, double magnitude, int32_t blockSize);
+    // With a class already parsed: a catalogue holds few different class texts.
+    Star(GravName name, const SpectralClass& spectralClass, double magnitude, int32_t blockSize);
 
     int32_t WhatAmI() const override { return kStarKind; }
 

@@ -1,7 +1,7 @@
 // A star system's construction.
 #include "catalog/StarSystem.h"
 
-StarSystem::StarSystem(const char* name, SVector position, double luminosity,
+StarSystem::StarSystem(GravName name, SVector position, double luminosity,
     const ColorTable* colorTable, int32_t blockSize)
     : GravSystem(name, blockSize)
     , position(position)

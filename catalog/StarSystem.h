@@ -10,7 +10,7 @@ class Star;
 
 class StarSystem : public GravSystem {
 public:
-    StarSystem(const char* name, SVector position, double luminosity, const ColorTable* colorTable,
+    StarSystem(GravName name, SVector position, double luminosity, const ColorTable* colorTable,
         int32_t blockSize);
 
     int32_t WhatAmI() const override { return kStarSystemKind; }

@@ -132,6 +132,68 @@ bool ZeroIfNotFinite(double* value)
     return true;
 }
 
+// Class texts already parsed. A catalogue holds a few thousand different texts among a
+// million stars; parsing one is the same work every time. Texts of up to 7 characters are
+// remembered, keyed by their bytes, one per slot.
+class ClassMemo {
+public:
+    const SpectralClass& Parsed(const char* text)
+    {
+        const size_t length = strnlen(text, sizeof(uint64_t));
+        if (length == sizeof(uint64_t)) {
+            fLong.SetSpectralClass(text);
+            return fLong;
+        }
+        uint64_t key = 0;
+        std::memcpy(&key, text, length);
+        Slot& slot = fSlots[(key * 0x9E3779B97F4A7C15u) >> (64 - kSlotBits)];
+        if (!slot.used || slot.key != key) {
+            slot.parsed.SetSpectralClass(text);
+            slot.key = key;
+            slot.used = true;
+        }
+        return slot.parsed;
+    }
+
+private:
+    static constexpr int kSlotBits = 8;
+    struct Slot {
+        uint64_t key = 0;
+        bool used = false;
+        SpectralClass parsed;
+    };
+    Slot fSlots[size_t(1) << kSlotBits];
+    SpectralClass fLong;
+};
+
+// Luminosities of magnitudes already met: written with two or three decimals, a million stars
+// have a few tens of thousands of different magnitudes, and pow is dear. Keyed by the
+// magnitude's bits, so every luminosity is the very value SolarLuminosity gives.
+class LuminosityMemo {
+public:
+    double Of(double magnitude)
+    {
+        uint64_t bits;
+        std::memcpy(&bits, &magnitude, sizeof bits);
+        Slot& slot = fSlots[(bits * 0x9E3779B97F4A7C15u) >> (64 - kSlotBits)];
+        if (slot.bits != bits) {
+            slot.bits = bits;
+            slot.luminosity = SolarLuminosity(magnitude);
+        }
+        return slot.luminosity;
+    }
+
+private:
+    static constexpr int kSlotBits = 13;
+    // A NaN's bits: magnitudes reaching here are finite, so no slot matches before it is set.
+    static constexpr uint64_t kNone = ~uint64_t(0);
+    struct Slot {
+        uint64_t bits = kNone;
+        double luminosity = 0;
+    };
+    std::vector<Slot> fSlots = std::vector<Slot>(size_t(1) << kSlotBits);
+};
+
 std::filesystem::path CataloguePath(const char* fileName)
 {
     const std::filesystem::path path(fileName);
@@ -166,8 +228,10 @@ bool ReadCatalogue(std::FILE* file, int32_t maxStars, Universe* universe, size_t
     char classText[kMaxLine + 1] = "";
     double magnitude = 0, x = 0, y = 0, z = 0;
     SVector previous(0, 0, 314000); // no catalogue star sits there
-    char name[kMaxName + 1];
+    CatalogueArena* arena = universe->Arena();
     StarSystem* system = nullptr;
+    auto classes = std::make_unique<ClassMemo>();
+    LuminosityMemo luminosities;
 
     int64_t line = 1; // of the file, where the next line starts
     int32_t records = 0;
@@ -175,9 +239,8 @@ bool ReadCatalogue(std::FILE* file, int32_t maxStars, Universe* universe, size_t
         const CatalogueLine nameLine = text.Line();
         const int64_t nameAt = line;
         line += nameLine.split ? 0 : 1;
-        const size_t kept = std::min(nameLine.length, kMaxName);
-        std::memcpy(name, nameLine.text, kept);
-        name[kept] = '\0';
+        // One copy of the name, cut to kMaxName, shared by the star and the system it opens.
+        char* name = arena->Keep(nameLine.text, std::min(nameLine.length, kMaxName));
 
         const CatalogueLine dataLine = text.Line();
         const int64_t dataAt = line;
@@ -202,13 +265,14 @@ bool ReadCatalogue(std::FILE* file, int32_t maxStars, Universe* universe, size_t
             || std::fabs(magnitude) > kBrightestCatalogueMagnitude)
             Count(&met.outOfRange, &met.outOfRangeLine, dataAt);
 
-        auto* star = new Star(name, classText, magnitude, 1);
+        auto* star
+            = arena->Make<Star>(GravName::Kept(name), classes->Parsed(classText), magnitude, 1);
         // A first record at the sentinel position still opens a system of its own.
         if (!system || x != previous.x || y != previous.y || z != previous.z) {
             previous.Set(x, y, z);
-            const double luminosity = SolarLuminosity(magnitude);
-            system = new StarSystem(
-                name, previous, luminosity, SpectralTableFor(star->spectralClass.harvardClass), 2);
+            const double luminosity = luminosities.Of(magnitude);
+            system = arena->Make<StarSystem>(GravName::Kept(name), previous, luminosity,
+                SpectralTableFor(star->spectralClass.harvardClass), 2);
             universe->AddItem(system);
         }
         system->AddItem(star);
@@ -217,7 +281,8 @@ bool ReadCatalogue(std::FILE* file, int32_t maxStars, Universe* universe, size_t
     if (text.Binary()) {
         // Not a catalogue: nothing of it stays.
         while (universe->CountItems() > before)
-            delete static_cast<StarSystem*>(universe->RemoveItem(universe->CountItems() - 1));
+            GravSystem::Destroy(
+                static_cast<StarSystem*>(universe->RemoveItem(universe->CountItems() - 1)));
         met = CatalogueReport();
         met.notText = true;
     }
@@ -271,5 +336,5 @@ Universe::~Universe()
 {
     const int32_t count = CountItems();
     for (int32_t i = 0; i < count; i++)
-        delete static_cast<StarSystem*>(ItemAtFast(i));
+        GravSystem::Destroy(static_cast<StarSystem*>(ItemAtFast(i)));
 }

@@ -2,6 +2,7 @@
 // list is its identity everywhere in the program.
 #pragma once
 
+#include "catalog/CatalogueArena.h"
 #include "catalog/SpectralClass.h"
 #include "catalog/StarNames.h"
 #include "catalog/StarSystem.h"
@@ -53,12 +54,18 @@ public:
 
     StarSystem* SystemAt(int32_t index) const { return static_cast<StarSystem*>(ItemAt(index)); }
 
+    // Where the systems, stars and names read from a catalogue are built; released with the
+    // universe, after its systems.
+    CatalogueArena* Arena() { return &arena; }
+
     // Every other name of the stars, by system: filled from a names file beside the catalogue
     // (ReadStarNames) before the universe is shown, only read after that. Empty when there is
     // none.
     StarNames otherNames;
 
 private:
+    CatalogueArena arena;
+
     // Appends count unnamed, starless systems at random positions drawn from random.
     void Scatter(int64_t count, double radius, Random& random);
 };

@@ -3,7 +3,9 @@
 #include <gtest/gtest.h>
 
 #include <cmath>
+#include <cstdint>
 #include <cstdio>
+#include <cstdlib>
 #include <cstring>
 #include <memory>
 #include <random>
@@ -181,4 +183,136 @@ TEST(CNumbers, FormatDoubleWritesWhatScanDoubleReadsBack)
     char small[4];
     EXPECT_EQ(FormatDouble(small, sizeof small, "%.3f", 12.5), 6);
     EXPECT_STREQ(small, "12.");
+}
+
+namespace {
+
+// What strtod makes of text: its bits and where it stopped.
+struct Strtod {
+    uint64_t bits;
+    size_t length;
+};
+
+Strtod ByStrtod(const std::string& text)
+{
+    char* end = nullptr;
+    const double value = std::strtod(text.c_str(), &end);
+    uint64_t bits;
+    std::memcpy(&bits, &value, sizeof bits);
+    return { bits, size_t(end - text.c_str()) };
+}
+
+// Reads text with the plain-decimal path; when it takes the text, the value must be strtod's
+// to the bit, and the end the same. Returns whether it took it.
+bool TakenAsStrtodReadsIt(const std::string& text)
+{
+    double value = -777;
+    const char* end = ScanPlainDecimal(text.data(), text.data() + text.size(), &value);
+    if (!end) {
+        EXPECT_EQ(value, -777) << '"' << text << '"';
+        return false;
+    }
+    const Strtod expected = ByStrtod(text);
+    uint64_t bits;
+    std::memcpy(&bits, &value, sizeof bits);
+    EXPECT_EQ(bits, expected.bits) << '"' << text << "\" read as " << value;
+    EXPECT_EQ(size_t(end - text.data()), expected.length) << '"' << text << '"';
+    return true;
+}
+
+} // namespace
+
+TEST(CNumbers, CatalogueDecimalsReadBitForBitAsStrtod)
+{
+    // Magnitudes and positions as the importer and the benchmarks write them, over every
+    // scale a catalogue of the neighbourhood holds: every one takes the plain path.
+    std::mt19937_64 random(20261124);
+    char text[64];
+    for (int i = 0; i < 200000; i++) {
+        const double scale = std::pow(10.0, double(random() % 12) - 5);
+        const double value = std::uniform_real_distribution<double>(-1, 1)(random) * scale;
+        std::snprintf(text, sizeof text, "%.*f", int(random() % 10), value);
+        ASSERT_TRUE(TakenAsStrtodReadsIt(text)) << text;
+        std::snprintf(text, sizeof text, "%.3f", value);
+        ASSERT_TRUE(TakenAsStrtodReadsIt(text)) << text;
+        std::snprintf(text, sizeof text, "%.6f", value);
+        ASSERT_TRUE(TakenAsStrtodReadsIt(text)) << text;
+    }
+}
+
+TEST(CNumbers, RandomDigitStringsReadBitForBitAsStrtodOrNotAtAll)
+{
+    // Up to 25 digits with the point anywhere, or nowhere: long ones must be left to the
+    // general reader, every other exactly as strtod reads it.
+    std::mt19937_64 random(7);
+    int taken = 0;
+    for (int i = 0; i < 300000; i++) {
+        std::string text = random() % 2 ? "-" : "";
+        const int digits = 1 + int(random() % 25);
+        const int point = int(random() % (digits + 2)) - 1; // -1: no point
+        for (int d = 0; d < digits; d++) {
+            if (d == point)
+                text += '.';
+            text += char('0' + random() % 10);
+        }
+        if (point == digits)
+            text += '.';
+        taken += TakenAsStrtodReadsIt(text);
+    }
+    EXPECT_GT(taken, 100000);
+}
+
+TEST(CNumbers, PlainDecimalEdgeCases)
+{
+    for (const char* text :
+        { "0", "-0", "0.000", "-0.000", "1.", ".5", "-.5", "5.", "0.1", "0.2", "0.3",
+            "9007199254740992", "900719925473.0992", "0.1234567890123456", "123456.1234567890",
+            "-1797693.134862315", "0.000000000000000001", "1 2", "1\t", "12.5\n", "7\r" }) {
+        EXPECT_TRUE(TakenAsStrtodReadsIt(text)) << text;
+    }
+    double value = 0;
+    const std::string negativeZero = "-0.000";
+    ScanPlainDecimal(negativeZero.data(), negativeZero.data() + negativeZero.size(), &value);
+    EXPECT_TRUE(std::signbit(value));
+    EXPECT_EQ(value, 0);
+
+    // Everything else is the general readers' to read: nothing is stored.
+    for (const char* text : { "", "-", ".", "-.", "+1", "1e5", "1E5", "0x10", "1,5", "1.5.2", "nan",
+             "inf", "-inf", "1-", "9007199254740993", "4503599627370497.5", "2.2250738585072014",
+             "123456789012345678901", "0.00000000000000000000001", "00000000000000000001.5", "--1",
+             " 1", "1a" }) {
+        EXPECT_FALSE(TakenAsStrtodReadsIt(text)) << '"' << text << '"';
+    }
+    // The end bounds the text: "12" of "123", the digits before a NUL.
+    const char digits[] = "123";
+    EXPECT_EQ(ScanPlainDecimal(digits, digits + 2, &value), digits + 2);
+    EXPECT_EQ(value, 12);
+    const std::string withNul("4.5\0"
+                              "6",
+        5);
+    EXPECT_EQ(ScanPlainDecimal(withNul.data(), withNul.data() + withNul.size(), &value),
+        withNul.data() + 3);
+    EXPECT_EQ(value, 4.5);
+}
+
+TEST(CNumbers, PlainDecimalsNeverLookPastTheirEnd)
+{
+    // Digits to the very end of buffers of every length, each allocated to its size, so that
+    // a read past the end is caught by the address sanitizer.
+    for (size_t length = 1; length <= 24; length++) {
+        const auto buffer = std::make_unique<char[]>(length);
+        for (size_t i = 0; i < length; i++)
+            buffer[i] = char('1' + i % 9);
+        if (length > 2)
+            buffer[1] = '.';
+        double value = 0;
+        const char* end = ScanPlainDecimal(buffer.get(), buffer.get() + length, &value);
+        const std::string text(buffer.get(), length);
+        if (end) {
+            EXPECT_EQ(end, buffer.get() + length) << text;
+            EXPECT_EQ(value, std::strtod(text.c_str(), nullptr)) << text;
+        } else {
+            EXPECT_GT(length, 17u) << text;
+        }
+    }
 }

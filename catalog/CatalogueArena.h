@@ -1,0 +1,50 @@
+// Storage for the stars, systems and names of a catalogue: large blocks handed out in order,
+// released all at once with the arena. A million stars would otherwise be two million small
+// allocations, each with its own header and its own trip through the allocator.
+#pragma once
+
+#include "catalog/GravSystem.h"
+
+#include <cstddef>
+#include <memory>
+#include <new>
+#include <type_traits>
+#include <utility>
+#include <vector>
+
+class CatalogueArena {
+public:
+    CatalogueArena() = default;
+    CatalogueArena(const CatalogueArena&) = delete;
+    CatalogueArena& operator=(const CatalogueArena&) = delete;
+
+    // A system or star built in the arena. Its owner ends it with GravSystem::Destroy, which
+    // runs its destructor and leaves the storage to the arena; the arena must outlive it.
+    template <class T, class... Arguments> T* Make(Arguments&&... arguments)
+    {
+        static_assert(std::is_base_of_v<GravSystem, T>);
+        T* made = new (Allocate(sizeof(T), alignof(T))) T(std::forward<Arguments>(arguments)...);
+        made->inArena = true;
+        return made;
+    }
+
+    // A NUL-terminated copy of length characters of text, which lives as long as the arena.
+    char* Keep(const char* text, size_t length);
+
+    // Bytes of the blocks taken from the system so far.
+    size_t Reserved() const { return fBlocks.size() * kBlockSize; }
+
+private:
+    // Large enough that the blocks are few, small enough that the last one wastes little.
+    static constexpr size_t kBlockSize = size_t(4) << 20;
+    static constexpr size_t kPage = 4096;
+
+    void* Allocate(size_t size, size_t alignment);
+
+    struct FreeBlock {
+        void operator()(std::byte* block) const;
+    };
+    std::vector<std::unique_ptr<std::byte[], FreeBlock>> fBlocks;
+    std::byte* fNext = nullptr; // the free part of the last block
+    size_t fLeft = 0; // bytes free there
+};
