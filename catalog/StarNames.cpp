@@ -6,8 +6,10 @@
 
 #include "catalog/Universe.h"
 
+#include <algorithm>
 #include <charconv>
 #include <cstring>
+#include <iterator>
 #include <limits>
 #include <string>
 #include <string_view>
@@ -21,6 +23,8 @@ bool StarNames::Add(int32_t system, const char* name, size_t length)
     while (fEnd.size() <= size_t(system))
         fEnd.push_back(static_cast<uint32_t>(fText.size()));
     fText.insert(fText.end(), name, name + length);
+    for (size_t i = 0; i < length; i++)
+        fByteCount[static_cast<unsigned char>(name[i])]++;
     fText.push_back('\0');
     fEnd.back() = static_cast<uint32_t>(fText.size());
     fCount++;
@@ -38,6 +42,7 @@ void StarNames::Clear()
     fText = {};
     fEnd = {};
     fCount = 0;
+    std::fill(std::begin(fByteCount), std::end(fByteCount), 0);
 }
 
 namespace {

@@ -45,6 +45,10 @@ public:
     // Every system's names, in system order.
     Range All() const { return { fText.data(), fText.data() + fText.size() }; }
 
+    // How many times byte occurs in the names held: searches look first for the pattern's
+    // rarest byte.
+    uint64_t ByteCount(unsigned char byte) const { return fByteCount[byte]; }
+
     bool Empty() const { return fText.empty(); }
     int64_t Count() const { return fCount; } // names held
     size_t TextBytes() const { return fText.size(); } // the arena, NULs included
@@ -55,6 +59,7 @@ private:
     std::vector<char> fText; // every name and its NUL, in system order
     std::vector<uint32_t> fEnd; // per system from 0: where its names end in fText
     int64_t fCount = 0;
+    uint64_t fByteCount[256] = {};
 };
 
 // What reading a names file met that a well-made one does not hold. Lines are the file's own,

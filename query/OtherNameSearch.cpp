@@ -8,6 +8,7 @@
 
 #include "query/StarNameQuery.h"
 
+#include <cstdint>
 #include <cstring>
 
 namespace {
@@ -52,33 +53,46 @@ void OtherNameSearch::Start(const StarNames* names, int32_t mode, const char* pa
     fSearchedFrom = nullptr;
     fNextHit = nullptr;
     fHitKnown = false;
-    fFirstCount = 0;
-    fExact = caseSensitive;
+    fAnchor = 0;
+    fAnchorCount = 0;
+    fExact = true;
     if (patternLength == 0)
         return;
-    if (caseSensitive) {
-        fFirst[fFirstCount++] = static_cast<unsigned char>(pattern[0]);
-        return;
-    }
-    // The bytes that lower-case to each byte of the pattern.
-    fExact = true;
+    // For each byte of the pattern the name bytes that stand for it, and how often they occur.
+    uint64_t fewest = UINT64_MAX;
     for (int32_t k = 0; k < patternLength; k++) {
         const auto wanted = static_cast<unsigned char>(pattern[k]);
-        int32_t found = 0;
-        for (int32_t c = 1; c < 256; c++) {
-            if (lower[c] != wanted)
-                continue;
-            if (k == 0 && found < 2)
-                fFirst[found] = static_cast<unsigned char>(c);
-            if (c != wanted)
+        unsigned char bytes[2] = { wanted, wanted };
+        int32_t found = 1;
+        if (!caseSensitive) {
+            found = 0;
+            for (int32_t c = 1; c < 256; c++) {
+                if (lower[c] != wanted)
+                    continue;
+                if (found < 2)
+                    bytes[found] = static_cast<unsigned char>(c);
+                found++;
+            }
+            if (found != 1 || bytes[0] != wanted)
                 fExact = false;
-            found++;
         }
-        if (found != 1)
-            fExact = false;
-        if (k == 0)
-            fFirstCount = found <= 2 ? found : 0;
+        if (found < 1 || found > 2)
+            continue;
+        uint64_t occurrences = 0;
+        for (int32_t i = 0; i < found; i++)
+            occurrences += names->ByteCount(bytes[i]);
+        if (occurrences < fewest) {
+            fewest = occurrences;
+            fAnchor = k;
+            fAnchorCount = found;
+            fAnchorBytes[0] = bytes[0];
+            fAnchorBytes[1] = bytes[found - 1];
+        }
     }
+    // memchr finds a rare byte fast and memmem a text of common ones (digits, say): measured
+    // over names like a Gaia-era sky's, the anchor's hits and checks cost more than memmem once
+    // its byte is more than about one name byte in 64.
+    fAnchorCommon = fewest != UINT64_MAX && fewest * 64 > names->TextBytes();
 }
 
 bool OtherNameSearch::Matches(int32_t index)
@@ -121,49 +135,55 @@ bool OtherNameSearch::Contains(StarNames::Range names)
 
 const char* OtherNameSearch::Find(const char* from, const char* to) const
 {
-    if (fExact) {
+    if (fExact && fAnchorCommon) {
         return static_cast<const char*>(memmem(from, size_t(to - from), fPattern, size_t(fLength)));
     }
+    if (fExact)
+        return FindFolded(from, to, [](char c) { return c; });
     const unsigned char* lower = fLower;
     return FindFolded(from, to,
         [lower](char c) { return static_cast<char>(lower[static_cast<unsigned char>(c)]); });
 }
 
-// Where the pattern may start is found with memchr for each of the bytes (at most two) that
-// lower-case to its first byte, or byte by byte when more do; the rest is compared there. A NUL
-// lower-cases to NUL, which no pattern byte is, so no comparison passes the NUL that ends the
-// last name.
+// Where the pattern may occur is found with memchr for each of the bytes (at most two) that
+// stand for its anchor byte, or byte by byte when no byte of it has two or fewer; the rest is
+// compared there. A NUL lower-cases to NUL, which no pattern byte is, so no comparison passes
+// the NUL that ends the last name, nor the one that begins a name.
 template <typename Fold>
 const char* OtherNameSearch::FindFolded(const char* from, const char* to, Fold fold) const
 {
-    const auto restAt = [this, fold](const char* s) {
-        for (int32_t k = 1; k < fLength; k++) {
-            if (fPattern[k] != fold(s[k]))
+    // The whole pattern at s, whose anchor byte is known to match.
+    const auto at = [this, fold](const char* s) {
+        for (int32_t k = 0; k < fLength; k++) {
+            if (k != fAnchor && fPattern[k] != fold(s[k]))
                 return false;
         }
         return true;
     };
-    if (fFirstCount == 0) {
+    if (fAnchorCount == 0) {
         for (const char* s = from; s < to; s++) {
-            if (fold(*s) == fPattern[0] && restAt(s))
+            if (fold(*s) == fPattern[0] && at(s))
                 return s;
         }
         return nullptr;
     }
-    const auto next = [to](const char* at, unsigned char byte) {
-        return static_cast<const char*>(std::memchr(at, byte, size_t(to - at)));
+    if (to - from <= fAnchor)
+        return nullptr;
+    const auto next = [to](const char* here, unsigned char byte) {
+        return static_cast<const char*>(std::memchr(here, byte, size_t(to - here)));
     };
-    const char* a = next(from, fFirst[0]);
-    const char* b = fFirstCount > 1 ? next(from, fFirst[1]) : nullptr;
+    // Hits of the anchor byte; the pattern would start fAnchor bytes before each.
+    const char* a = next(from + fAnchor, fAnchorBytes[0]);
+    const char* b = fAnchorCount > 1 ? next(from + fAnchor, fAnchorBytes[1]) : nullptr;
     while (a || b) {
         const bool fromA = a && (!b || a < b);
-        const char* s = fromA ? a : b;
-        if (restAt(s))
-            return s;
+        const char* hit = fromA ? a : b;
+        if (at(hit - fAnchor))
+            return hit - fAnchor;
         if (fromA)
-            a = next(a + 1, fFirst[0]);
+            a = next(a + 1, fAnchorBytes[0]);
         else
-            b = next(b + 1, fFirst[1]);
+            b = next(b + 1, fAnchorBytes[1]);
     }
     return nullptr;
 }

@@ -32,12 +32,16 @@ private:
     int32_t fLength = 0;
     bool fCaseSensitive = false;
     const unsigned char* fLower = nullptr;
-    // Name bytes that may stand where the pattern starts: those that lower-case to its first
-    // byte (or the byte itself with regard to case). fFirstCount is 0 when there are more than
-    // two, and fExact is set when no byte of the pattern has another that lower-cases to it, so
-    // that the pattern is searched for byte for byte.
-    unsigned char fFirst[2] = {};
-    int32_t fFirstCount = 0;
+    // The pattern's anchor: the position of the byte looked for first, chosen as the one whose
+    // name bytes (those that lower-case to it, or the byte itself with regard to case) are
+    // fewest in the names, and those bytes. fAnchorCount is 0 when more than two bytes
+    // lower-case to every byte of the pattern. fExact is set when no byte of the pattern has
+    // another that lower-cases to it, so that the pattern is compared byte for byte (and searched
+    // for with memmem when its anchor is common).
+    int32_t fAnchor = 0;
+    unsigned char fAnchorBytes[2] = {};
+    int32_t fAnchorCount = 0;
+    bool fAnchorCommon = false; // the anchor's bytes are common in the names
     bool fExact = false;
     // "contains" over a run: the names searched from fSearchedFrom up to the end, and the first
     // occurrence found there (null for none) when fHitKnown.

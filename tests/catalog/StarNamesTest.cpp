@@ -263,7 +263,12 @@ TEST(StarNames, SystemsAreFilledInOrder)
     EXPECT_EQ(std::string(names.Of(2).begin, names.Of(2).end), std::string("HD 1\0HD 2\0", 10));
     EXPECT_EQ(std::string(names.Of(5).begin, names.Of(5).end), std::string("X\0", 2));
     EXPECT_EQ(names.Of(6).begin, nullptr);
+    EXPECT_EQ(names.ByteCount('H'), 2u);
+    EXPECT_EQ(names.ByteCount('X'), 1u);
+    EXPECT_EQ(names.ByteCount('Y'), 0u); // refused
+    EXPECT_EQ(names.ByteCount(0), 0u);
     names.Clear();
+    EXPECT_EQ(names.ByteCount('H'), 0u);
     EXPECT_TRUE(names.Empty());
     EXPECT_EQ(names.Count(), 0);
     EXPECT_EQ(names.Of(2).begin, nullptr);

@@ -330,31 +330,35 @@ bool PlainNameTest(int32_t mode, std::string name, std::string text, bool caseSe
 TEST(StarSysQuery, OtherNamesAreFoundAsThePlainTestsFindThem)
 {
     // Short names from a few letters, digits and a blank, so that texts of up to three of them
-    // are found often, several times in one system and across the ends of names.
+    // are found often, several times in one system and across the ends of names; now and then
+    // a rare character, which a search looks for first when its text holds one.
     std::mt19937 random(26);
-    const char kLetters[] = "aAbB12 ";
-    const auto word = [&](size_t most) {
+    const char kCommon[] = "aAbB12 ";
+    const char kRare[] = "zZ9";
+    const auto word = [&](size_t most, uint32_t rareOneIn) {
         std::string w(random() % (most + 1), ' ');
-        for (char& c : w)
-            c = kLetters[random() % (sizeof kLetters - 1)];
+        for (char& c : w) {
+            c = random() % rareOneIn == 0 ? kRare[random() % (sizeof kRare - 1)]
+                                          : kCommon[random() % (sizeof kCommon - 1)];
+        }
         return w;
     };
     Universe u(20);
     std::vector<std::vector<std::string>> names; // every name of each system, its own first
     for (int32_t i = 0; i < 300; i++) {
-        std::string own = word(4);
+        std::string own = word(4, 100);
         AddTestSystem(u, i, 0, 0, { { own.c_str(), "G2V", 4.83 } });
         names.push_back({ own });
         const int32_t others = random() % 4 == 0 ? 0 : int32_t(random() % 5);
         for (int32_t k = 0; k < others; k++) {
-            std::string other = word(5);
+            std::string other = word(5, 100);
             if (!other.empty() && u.otherNames.Add(i, other.data(), other.size()))
                 names.back().push_back(other);
         }
     }
     StarNameQuery query(&u);
-    for (int32_t round = 0; round < 400; round++) {
-        const std::string text = word(3);
+    for (int32_t round = 0; round < 600; round++) {
+        const std::string text = word(3, 4);
         const int32_t mode = round % 3;
         const bool caseSensitive = round % 2 == 1;
         std::set<int32_t> expected;
