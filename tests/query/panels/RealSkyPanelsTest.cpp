@@ -133,13 +133,14 @@ class RealSkyOtherNames : public RealSkyPanels {
 protected:
     static Universe& NamedSky()
     {
-        static Universe* universe = [] {
+        static const std::unique_ptr<Universe> universe = [] {
             const std::string dat = std::string(ND_APP_DIR) + "/stars.dat";
-            auto* u = new Universe(dat.c_str(), 1000000, 5000);
+            auto u = std::make_unique<Universe>(dat.c_str(), 1000000, 5000);
             std::unique_ptr<std::FILE, int (*)(std::FILE*)> names(
                 std::fopen((std::string(ND_APP_DIR) + "/stars.names").c_str(), "rb"), &std::fclose);
             if (names)
-                ReadStarNames(names.get(), std::filesystem::file_size(dat), false, u, &sReport);
+                ReadStarNames(
+                    names.get(), std::filesystem::file_size(dat), false, u.get(), &sReport);
             return u;
         }();
         return *universe;
