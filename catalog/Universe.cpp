@@ -26,6 +26,9 @@ constexpr size_t kMaxName = 79;
 // line feed).
 constexpr size_t kMaxRecord = 2 * (kMaxLine + 2);
 
+// Bytes past the window the number reader may load (and ignores).
+constexpr size_t kLoadSlack = 8;
+
 // One line of the catalogue text: where its characters stand, how many were taken, and whether
 // the line went on past them (so that its rest is read as the next line).
 struct CatalogueLine {
@@ -40,7 +43,7 @@ class CatalogueText {
 public:
     CatalogueText(std::FILE* file, size_t window, const CatalogueProgress& progress)
         : fFile(file)
-        , fBuffer(window + kMaxRecord)
+        , fBuffer(window + kMaxRecord + kLoadSlack)
         , fProgress(progress)
     {
         std::setvbuf(file, nullptr, _IONBF, 0);
@@ -56,6 +59,10 @@ public:
 
     // Whether a NUL byte has been read: no text holds one.
     bool Binary() const { return fBinary; }
+
+    // How far the buffer may be loaded from, past the text's end: the number reader takes
+    // eight characters at a time and ignores those past a line's end.
+    const char* Readable() const { return fBuffer.data() + fBuffer.size(); }
 
     // The next line: its characters up to the line feed, at most kMaxLine of them; the read
     // position then steps over one more character. A carriage return before the line feed
@@ -92,9 +99,9 @@ private:
         std::memmove(fBuffer.data(), fBuffer.data() + fLimit - kept, kept);
         fLimit = kept;
         fPosition = 0;
-        while (!fEnded && fLimit < fBuffer.size()) {
-            const size_t got
-                = std::fread(fBuffer.data() + fLimit, 1, fBuffer.size() - fLimit, fFile);
+        const size_t capacity = fBuffer.size() - kLoadSlack;
+        while (!fEnded && fLimit < capacity) {
+            const size_t got = std::fread(fBuffer.data() + fLimit, 1, capacity - fLimit, fFile);
             if (std::memchr(fBuffer.data() + fLimit, '\0', got))
                 fBinary = true;
             fLimit += got;
@@ -245,8 +252,8 @@ bool ReadCatalogue(std::FILE* file, int32_t maxStars, Universe* universe, size_t
         const CatalogueLine dataLine = text.Line();
         const int64_t dataAt = line;
         line += dataLine.split ? 0 : 1;
-        const int fields = ScanCatalogueData(
-            dataLine.text, dataLine.text + dataLine.length, classText, &magnitude, &x, &y, &z);
+        const int fields = ScanCatalogueData(dataLine.text, dataLine.text + dataLine.length,
+            text.Readable(), classText, &magnitude, &x, &y, &z);
 
         if (nameLine.split || dataLine.split || fields < 5) {
             if (met.malformed == 0)

@@ -316,3 +316,32 @@ TEST(CNumbers, PlainDecimalsNeverLookPastTheirEnd)
         }
     }
 }
+
+TEST(CNumbers, DigitsPastTheLineThatMayBeLoadedAreNotRead)
+{
+    // Lines cut at every length, each followed in its buffer by more digits: the reader may
+    // load them eight at a time, and must read only the line, as sscanf reads it alone.
+    std::mt19937_64 random(99);
+    std::uniform_real_distribution<double> spread(-500, 500);
+    char text[200];
+    for (int i = 0; i < 2000; i++) {
+        std::snprintf(text, sizeof text, "K%dV %.2f %.6f %.6f %.6f", int(random() % 10),
+            spread(random) / 40, spread(random), spread(random), spread(random));
+        const std::string whole = text;
+        const size_t length = random() % (whole.size() + 1);
+        const std::string line = whole.substr(0, length);
+        const std::string buffer = line + "123456789012345678";
+        Fields f {};
+        std::strcpy(f.word, "unset");
+        f.m = f.x = f.y = f.z = -777;
+        f.count = ScanCatalogueData(buffer.data(), buffer.data() + length,
+            buffer.data() + buffer.size(), f.word, &f.m, &f.x, &f.y, &f.z);
+        const Fields expected = Reference(line);
+        ASSERT_EQ(f.count, expected.count) << '"' << line << '"';
+        ASSERT_STREQ(f.word, expected.word) << '"' << line << '"';
+        ASSERT_EQ(f.m, expected.m) << '"' << line << '"';
+        ASSERT_EQ(f.x, expected.x) << '"' << line << '"';
+        ASSERT_EQ(f.y, expected.y) << '"' << line << '"';
+        ASSERT_EQ(f.z, expected.z) << '"' << line << '"';
+    }
+}

@@ -2,12 +2,15 @@
 // reading window, so that records fall across its edges; the rest is the catalogue. Whatever the
 // window, the universe read and what the reading reports are those a window holding the whole
 // input gives; every name is one line of at most 79 characters, every number finite, and an
-// input with a NUL byte reads as no catalogue at all.
+// input with a NUL byte reads as no catalogue at all. The input's first line, scanned as a data
+// line, reads exactly as the C library reads it.
 #include "ImportRoundTrip.h"
 
+#include "catalog/CNumbers.h"
 #include "catalog/Star.h"
 #include "catalog/Universe.h"
 
+#include <algorithm>
 #include <cmath>
 #include <cstdio>
 #include <cstring>
@@ -33,6 +36,42 @@ bool Same(double a, double b)
     return std::memcmp(&a, &b, sizeof a) == 0;
 }
 
+// The input's first line, up to 500 characters, read as a data line by the reader's scanner,
+// from a buffer of its own size and from one it may load past the line, must give exactly
+// what the C library's sscanf gives.
+void CheckDataLineAgainstTheCLibrary(const std::string& text)
+{
+    const size_t length = std::min(text.find('\n'), std::min<size_t>(text.size(), 500));
+    const std::string line = text.substr(0, length);
+    struct Fields {
+        int count;
+        char word[501];
+        double values[4];
+    };
+    Fields reference {}, exact {}, padded {};
+    for (Fields* f : { &reference, &exact, &padded }) {
+        std::strcpy(f->word, "unset");
+        for (double& value : f->values)
+            value = -777;
+    }
+    reference.count = std::sscanf(line.c_str(), "%500s %lf %lf %lf %lf", reference.word,
+        &reference.values[0], &reference.values[1], &reference.values[2], &reference.values[3]);
+    const auto own = std::make_unique<char[]>(length + 1);
+    std::memcpy(own.get(), line.data(), length);
+    exact.count = ScanCatalogueData(own.get(), own.get() + length, exact.word, &exact.values[0],
+        &exact.values[1], &exact.values[2], &exact.values[3]);
+    std::string roomy = line + std::string(16, '7');
+    padded.count = ScanCatalogueData(roomy.data(), roomy.data() + length,
+        roomy.data() + roomy.size(), padded.word, &padded.values[0], &padded.values[1],
+        &padded.values[2], &padded.values[3]);
+    for (const Fields* f : { &exact, &padded }) {
+        FuzzCheck(f->count == reference.count, "a data line scans a different number of fields");
+        FuzzCheck(std::strcmp(f->word, reference.word) == 0, "a data line's class differs");
+        for (int i = 0; i < 4; i++)
+            FuzzCheck(Same(f->values[i], reference.values[i]), "a data line's number differs");
+    }
+}
+
 } // namespace
 
 extern "C" int LLVMFuzzerTestOneInput(const uint8_t* data, size_t size)
@@ -41,6 +80,7 @@ extern "C" int LLVMFuzzerTestOneInput(const uint8_t* data, size_t size)
         return 0;
     const size_t window = 1 + size_t(data[0]) * 7;
     std::string text(reinterpret_cast<const char*>(data) + 1, size - 1);
+    CheckDataLineAgainstTheCLibrary(text);
 
     Universe small(5000), whole(5000);
     const CatalogueReport smallReport = Read(text, window, &small);
