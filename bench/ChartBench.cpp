@@ -14,12 +14,14 @@
 #include "resources/ResourceData.h"
 
 #include <QApplication>
+#include <QCoreApplication>
 #include <algorithm>
 #include <benchmark/benchmark.h>
 #include <chrono>
 #include <cmath>
 #include <map>
 #include <memory>
+#include <mutex>
 #include <random>
 
 namespace {
@@ -118,6 +120,45 @@ void BM_Frame(benchmark::State& state)
     state.counters["over_limit"] = frame / limit;
 }
 
+// A chart running as in the program, shown (on the offscreen platform) and turning, its frames
+// handed over and painted on this thread: the time from one frame's start to the next's, as
+// the render threads meet them, over three seconds. range(0), range(1), range(4) as for
+// BM_Frame; two threads or more (a worker marks each frame's start).
+void BM_RunningChart(benchmark::State& state)
+{
+    Universe* universe = UniverseOf(state.range(0));
+    const bool big = state.range(4) == 1920;
+    const int32_t width = big ? 1920 : 640, height = big ? 1061 : 480;
+    std::mutex lock;
+    std::vector<std::chrono::steady_clock::time_point> starts;
+    for (auto _ : state) {
+        UniverseView view(BRect(0, 0, float(width - 1), float(height - 1)), "UniverseView",
+            universe, int32_t(state.range(1)));
+        view.resize(width, height);
+        view.SetShareHook([&](int32_t share) {
+            if (share == 1) {
+                std::lock_guard hold(lock);
+                starts.push_back(std::chrono::steady_clock::now());
+            }
+        });
+        view.show();
+        view.AttachedToWindow();
+        const auto end = std::chrono::steady_clock::now() + std::chrono::seconds(3);
+        while (std::chrono::steady_clock::now() < end)
+            QCoreApplication::processEvents(QEventLoop::AllEvents, 5);
+        view.DetachedFromWindow();
+    }
+    std::vector<double> gaps;
+    for (size_t i = 1; i < starts.size(); i++)
+        gaps.push_back(
+            std::chrono::duration<double, std::milli>(starts[i] - starts[i - 1]).count());
+    std::sort(gaps.begin(), gaps.end());
+    state.counters["frames"] = double(starts.size());
+    state.counters["max_ms"] = gaps.empty() ? 0 : gaps.back();
+    state.counters["p99_ms"] = gaps.empty() ? 0 : gaps[gaps.size() * 99 / 100];
+    state.counters["median_ms"] = gaps.empty() ? 0 : gaps[gaps.size() / 2];
+}
+
 // The limit kernel alone over a million systems in the default view: systems a second.
 void BM_LimitKernel(benchmark::State& state)
 {
@@ -147,6 +188,15 @@ BENCHMARK(BM_Frame)
     ->UseRealTime();
 
 BENCHMARK(BM_LimitKernel)->Unit(benchmark::kMillisecond)->UseRealTime();
+
+BENCHMARK(BM_RunningChart)
+    ->ArgNames({ "systems", "threads", "front", "blocks", "width" })
+    ->Args({ 1000000, 2, 0, 1, 1920 })
+    ->Args({ 1000000, 2, 0, 1, 640 })
+    ->Args({ 0, 2, 0, 1, 1920 })
+    ->Iterations(1)
+    ->Unit(benchmark::kMillisecond)
+    ->UseRealTime();
 
 int main(int argc, char** argv)
 {
