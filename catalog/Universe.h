@@ -56,7 +56,7 @@ public:
 
     // Where the systems, stars and names read from a catalogue are built; released with the
     // universe, after its systems.
-    CatalogueArena* Arena() { return &arena; }
+    CatalogueArena* Arena() { return &fArena; }
 
     // Every other name of the stars, by system: filled from a names file beside the catalogue
     // (ReadStarNames) before the universe is shown, only read after that. Empty when there is
@@ -64,7 +64,7 @@ public:
     StarNames otherNames;
 
 private:
-    CatalogueArena arena;
+    CatalogueArena fArena;
 
     // Appends count unnamed, starless systems at random positions drawn from random.
     void Scatter(int64_t count, double radius, Random& random);
