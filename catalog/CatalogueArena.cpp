@@ -1,6 +1,7 @@
 // Handing out the arena's blocks.
 #include "catalog/CatalogueArena.h"
 
+#include <algorithm>
 #include <cstdint>
 #include <cstdlib>
 #include <cstring>
@@ -15,17 +16,19 @@ void* CatalogueArena::Allocate(size_t size, size_t alignment)
         // object. The block comes from the heap, where leak checkers look for the pointers
         // its objects hold. Every page of it will be written: where the system can, they are
         // all mapped in one call rather than one page fault each.
+        const size_t bytes = std::clamp(fReserved, kFirstBlock, kLargestBlock);
         std::unique_ptr<std::byte[], FreeBlock> owned(
-            static_cast<std::byte*>(std::aligned_alloc(kPage, kBlockSize)));
+            static_cast<std::byte*>(std::aligned_alloc(kPage, bytes)));
         if (!owned)
             throw std::bad_alloc();
         std::byte* block = owned.get();
         fBlocks.push_back(std::move(owned));
 #ifdef MADV_POPULATE_WRITE
-        madvise(block, kBlockSize, MADV_POPULATE_WRITE);
+        madvise(block, bytes, MADV_POPULATE_WRITE);
 #endif
         fNext = block;
-        fLeft = kBlockSize;
+        fLeft = bytes;
+        fReserved += bytes;
         return Allocate(size, alignment);
     }
     std::byte* given = fNext + skip;

@@ -32,11 +32,14 @@ public:
     char* Keep(const char* text, size_t length);
 
     // Bytes of the blocks taken from the system so far.
-    size_t Reserved() const { return fBlocks.size() * kBlockSize; }
+    size_t Reserved() const { return fReserved; }
 
 private:
-    // Large enough that the blocks are few, small enough that the last one wastes little.
-    static constexpr size_t kBlockSize = size_t(4) << 20;
+    // Blocks double from the first size to the largest, as much again as the arena holds: a
+    // catalogue of ten stars takes 64 KiB, not megabytes, and a million stars few blocks, the
+    // last of which wastes little.
+    static constexpr size_t kFirstBlock = size_t(64) << 10;
+    static constexpr size_t kLargestBlock = size_t(4) << 20;
     static constexpr size_t kPage = 4096;
 
     void* Allocate(size_t size, size_t alignment);
@@ -47,4 +50,5 @@ private:
     std::vector<std::unique_ptr<std::byte[], FreeBlock>> fBlocks;
     std::byte* fNext = nullptr; // the free part of the last block
     size_t fLeft = 0; // bytes free there
+    size_t fReserved = 0; // bytes of all the blocks
 };

@@ -331,11 +331,14 @@ Universe* Universe::Generate(
 
 void Universe::Scatter(int64_t count, double radius, Random& random)
 {
+    // A million systems in the arena, sharing one empty name: no allocation of their own.
+    char* unnamed = fArena.Keep("", 0);
     for (int64_t i = 0; i < count; i++) {
         const double x = random.Rand(20000) * 0.0001 * radius - radius;
         const double y = random.Rand(20000) * 0.0001 * radius - radius;
         const double z = random.Rand(20000) * 0.0001 * radius - radius;
-        AddItem(new StarSystem("", SVector(x, y, z), 1.0, nullptr, 5));
+        AddItem(
+            fArena.Make<StarSystem>(GravName::Kept(unnamed), SVector(x, y, z), 1.0, nullptr, 5));
     }
 }
 

@@ -166,3 +166,36 @@ TEST_F(CatalogueReadTest, RepeatedClassesAndMagnitudesReadAsEachOnItsOwn)
         ASSERT_EQ(s->colorTable, SpectralTableFor(expected.harvardClass)) << i;
     }
 }
+
+TEST(CatalogueArena, GeneratedSystemsAreBuiltInTheArenaAndShareOneEmptyName)
+{
+    // A generated million must not cost a million small allocations for empty names.
+    const std::unique_ptr<Universe> u(
+        Universe::Generate(3000, kMediumDensity, 500, Random(1, 4096, 150889, 714025)));
+    ASSERT_EQ(u->CountItems(), 3000);
+    const char* shared = u->SystemAt(0)->GetName();
+    for (int32_t i = 0; i < u->CountItems(); i++) {
+        const StarSystem* s = u->SystemAt(i);
+        EXPECT_TRUE(s->inArena) << i;
+        EXPECT_FALSE(s->ownsName) << i;
+        EXPECT_EQ(s->GetName(), shared) << i;
+    }
+    EXPECT_STREQ(shared, "");
+    EXPECT_GE(u->Arena()->Reserved(), 3000 * sizeof(StarSystem));
+}
+
+TEST_F(CatalogueReadTest, ASmallCatalogueTakesASmallBlockAndAMillionFewLargeOnes)
+{
+    // Tests and tools read many small catalogues: each must not claim megabytes.
+    const TempCatalogue file("Sol\nG2V 4.83 0 0 0\nAlpha Centauri A\nG2V 4.38 -0.5 -0.4 -1.2\n");
+    const Universe u(file.PathString().c_str(), 1000000, 5000);
+    ASSERT_EQ(u.CountItems(), 2);
+    EXPECT_LE(const_cast<Universe&>(u).Arena()->Reserved(), size_t(64) << 10);
+
+    CatalogueArena arena;
+    for (int i = 0; i < 200000; i++)
+        GravSystem::Destroy(arena.Make<StarSystem>("", SVector(i, 0, 0), 1.0, nullptr, 1));
+    // 16 MB of systems in blocks that double up to 4 MiB: no more than a block's worth over.
+    EXPECT_GE(arena.Reserved(), 200000 * sizeof(StarSystem));
+    EXPECT_LE(arena.Reserved(), 200000 * sizeof(StarSystem) + (size_t(4) << 20));
+}
