@@ -133,14 +133,14 @@ protected:
             __builtin_prefetch(systems[index]);
     }
 
-    // The magnitude, class and name of the first star of the system at index.
+    // The magnitude, class and name pointer of the first star of the system at index.
     [[gnu::always_inline]] void PrefetchFirstStar(void* const* systems, int32_t index) const
     {
         if (index < systemCount) {
             const auto* system = static_cast<const StarSystem*>(systems[index]);
             if (system->CountItems() > 0) {
                 const Star* star = system->StarAt(0);
-                __builtin_prefetch(star->name);
+                __builtin_prefetch(&star->name); // the star itself; no load before the search
                 __builtin_prefetch(&star->magnitude);
                 __builtin_prefetch(&star->spectralClass.decimalClass);
             }
