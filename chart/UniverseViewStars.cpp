@@ -32,6 +32,9 @@ constexpr int32_t kChunk = 256;
 struct Camera {
     double m00, m01, m02, m03, m10, m11, m12, m13, m20, m21, m22, m23;
     double f, cx, cy, right, bottom, reachX, reachY;
+    // Systems too faint to draw (brightness lum / z^2 under 1) are flagged only when every
+    // system on screen counts: while the mouse is in the view, any of them may be the target.
+    bool everyOne;
 };
 
 // Flags the systems of the arrays that may be on screen, for j below n: shown, in front, and
@@ -44,32 +47,35 @@ struct Camera {
 // systems are on screen is not predictable and mispredicted jumps cost more than comparisons.
 __attribute__((optimize("fp-contract=fast"))) inline void Flag(const double* __restrict px,
     const double* __restrict py, const double* __restrict pz, const uint8_t* __restrict shown,
-    int32_t n, const Camera c, uint8_t* __restrict near)
+    const double* __restrict lum, int32_t n, const Camera c, uint8_t* __restrict near)
 {
+    const uint8_t everyOne = c.everyOne;
     for (int32_t j = 0; j < n; j++) {
         const double x = px[j], y = py[j], z = pz[j];
         const double tx = c.m00 * x + c.m01 * y + c.m02 * z + c.m03;
         const double ty = c.m10 * x + c.m11 * y + c.m12 * z + c.m13;
         const double tz = c.m20 * x + c.m21 * y + c.m22 * z + c.m23;
+        // Bright enough with a margin of a millionth, far beyond the rounding.
+        const uint8_t bright = uint8_t(lum[j] * (1 + 1e-6) >= tz * tz) | everyOne;
         near[j] = uint8_t((shown[j] != 0) & (tz > 0) & (std::fabs(tx) <= c.reachX * tz)
-            & (std::fabs(ty) <= c.reachY * tz));
+            & (std::fabs(ty) <= c.reachY * tz) & bright);
     }
 }
 
 // Flags n consecutive systems from index first on: one version for processors with AVX2 and
 // FMA (four doubles a step), one for any x86-64 (two).
 ND_VECTOR_CLONES __attribute__((optimize("fp-contract=fast"))) void FlagChunk(const double* px,
-    const double* py, const double* pz, const uint8_t* shown, int32_t first, int32_t n,
-    const Camera& c, uint8_t* near)
+    const double* py, const double* pz, const uint8_t* shown, const double* lum, int32_t first,
+    int32_t n, const Camera& c, uint8_t* near)
 {
-    Flag(px + first, py + first, pz + first, shown + first, n, c, near);
+    Flag(px + first, py + first, pz + first, shown + first, lum + first, n, c, near);
 }
 
 // Flags n systems from index first on, every step-th: gathered into a chunk first.
 void FlagStrided(const double* px, const double* py, const double* pz, const uint8_t* shown,
-    int32_t first, int32_t n, int32_t step, const Camera& c, uint8_t* near)
+    const double* lum, int32_t first, int32_t n, int32_t step, const Camera& c, uint8_t* near)
 {
-    double x[kChunk], y[kChunk], z[kChunk];
+    double x[kChunk], y[kChunk], z[kChunk], l[kChunk];
     uint8_t s[kChunk];
     for (int32_t j = 0; j < n; j++) {
         const int32_t i = first + j * step;
@@ -77,8 +83,9 @@ void FlagStrided(const double* px, const double* py, const double* pz, const uin
         y[j] = py[i];
         z[j] = pz[i];
         s[j] = shown[i];
+        l[j] = lum[i];
     }
-    Flag(x, y, z, s, n, c, near);
+    Flag(x, y, z, s, l, n, c, near);
 }
 
 // The places in the chunk of the flagged systems, in order; how many there are. Few are in the
@@ -128,8 +135,8 @@ void UniverseView::RenderSpan(RBitmap8* target, int32_t begin, int32_t end, int3
     const Camera camera { m[0][0], m[0][1], m[0][2], m[0][3], m[1][0], m[1][1], m[1][2], m[1][3],
         m[2][0], m[2][1], m[2][2], m[2][3], focalLength, frame.right * 0.5, frame.bottom * 0.5,
         frame.right, frame.bottom, (frame.right * 0.5 + 1) / focalLength,
-        (frame.bottom * 0.5 + 1) / focalLength };
-    const bool hover = mouseInside.load(std::memory_order_relaxed);
+        (frame.bottom * 0.5 + 1) / focalLength, mouseInside.load(std::memory_order_relaxed) };
+    const bool hover = camera.everyOne;
     const float mx = mousePointX.load(std::memory_order_relaxed);
     const float my = mousePointY.load(std::memory_order_relaxed);
     const int32_t selected = selectedSystem.load(std::memory_order_relaxed);
@@ -142,11 +149,15 @@ void UniverseView::RenderSpan(RBitmap8* target, int32_t begin, int32_t end, int3
     for (int32_t first = begin; first < end; first += kChunk * step) {
         const int32_t n = std::min(kChunk, (end - first + step - 1) / step);
         if (step == 1)
-            FlagChunk(px, py, pz, drawMask->states, first, n, camera, near);
+            FlagChunk(px, py, pz, drawMask->states, lumCache.data(), first, n, camera, near);
         else
-            FlagStrided(px, py, pz, drawMask->states, first, n, step, camera, near);
+            FlagStrided(
+                px, py, pz, drawMask->states, lumCache.data(), first, n, step, camera, near);
         // A short last chunk: the flags past its end up to the next eight say off screen.
         std::memset(near + n, 0, size_t((8 - n % 8) % 8));
+        // The selection's place on the screen is noted however faint it is.
+        if (selected >= first && selected < first + n * step && (selected - first) % step == 0)
+            near[(selected - first) / step] = 1;
         const int32_t flagged = Flagged(near, n, places);
 
         for (int32_t v = 0; v < flagged; v++) {
