@@ -93,6 +93,8 @@ RBitmap8::RBitmap8(BRect frame, int32_t bytesPerRow)
     // An empty or inverted frame has no pixels: every primitive then rejects everything.
     if (bitsLength == 0)
         height = width = 0;
+    for (int i = 0; i < 256; ++i)
+        blackKeeps[i] = AddedIndex(uint8_t(i), 0) == i;
 }
 
 RBitmap8::~RBitmap8() = default;
@@ -366,8 +368,11 @@ void RBitmap8::RenderBitmapAdd(
     uint8_t* row = bits + y * bytesPerRow + x;
     for (int32_t j = 0; j < size; ++j, row += bytesPerRow) {
         const uint8_t* from = sampler.Row(j);
-        for (int32_t i = 0; i < size; ++i)
-            AddPixel(row + i, Spread(table->colors[from[sampler.Column(i)]]));
+        for (int32_t i = 0; i < size; ++i) {
+            const uint32_t add = Spread(table->colors[from[sampler.Column(i)]]);
+            if (add != 0 || !blackKeeps[LoadPixel(row + i)])
+                AddPixel(row + i, add);
+        }
     }
 }
 

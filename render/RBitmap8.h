@@ -111,4 +111,8 @@ private:
     // The system palette in the additive kernel's form: colours spread to 10-bit lanes. Not owned.
     const uint32_t* spreadPalette;
     const uint8_t* indexMap; // colorMap's inverse map; not owned
+    // Whether adding black leaves a pixel of each index as it is: true of all but the few
+    // palette entries whose colour the inverse map sends to another entry. Scaled glows, whose
+    // rims are black, skip such pixels.
+    bool blackKeeps[256];
 };

@@ -368,6 +368,37 @@ TEST(RBitmap8, AdditiveBlitUsesSamplesAsIntensities)
     std::free(table);
 }
 
+// A glow's black rim adds nothing, and the blit passes such pixels by; but adding black still
+// moves the few palette entries the inverse map sends elsewhere, on every pixel they fill.
+TEST(RBitmap8, AdditiveBlitOfBlackChangesWhatAddingBlackChanges)
+{
+    const color_map* map = system_colors();
+    int moved = 0;
+    for (int p = 0; p < 256; ++p)
+        moved += RBitmap8::AddedIndexReference(map, uint8_t(p), { 0, 0, 0, 0 }) != p;
+    ASSERT_GT(moved, 0) << "the palette has no entry that adding black moves";
+
+    const Source source;
+    ColorTable* table = NewTable({ 0, 0, 0, 0 });
+    table->colors[12] = { 30, 60, 90, 0 };
+    for (int round = 0; round < 4; ++round) {
+        Canvas b(16, 16), expected(16, 16);
+        for (int p = 0; p < 256; ++p)
+            b.Bits()[(p / 16) * b.BytesPerRow() + p % 16] = uint8_t(p + 37 * round);
+        std::memcpy(expected.Bits(), b.Bits(), size_t(b.BitsLength()));
+        // The 4 x 4 source scaled to 16 x 16: its one lit sample (12) covers a 4 x 4 square,
+        // every other sample is black in this table.
+        b.RenderBitmapAdd(0, 0, &source, 16, table);
+        for (int j = 0; j < 16; ++j)
+            for (int i = 0; i < 16; ++i)
+                expected.RenderPointAddReference(
+                    i, j, table, source.Bits()[(j / 4) * source.BytesPerRow() + i / 4]);
+        ASSERT_EQ(std::memcmp(b.Bits(), expected.Bits(), size_t(b.BitsLength())), 0)
+            << "round " << round;
+    }
+    std::free(table);
+}
+
 TEST(RBitmap8, TextDrawsOnlyInkAndAdvancesTheCursor)
 {
     Canvas b(12, 8);
