@@ -9,6 +9,7 @@
 #include <QGuiApplication>
 #include <QPainter>
 #include <algorithm>
+#include <unordered_map>
 
 UniverseView::UniverseView(
     BRect viewFrame, const char* name, Universe* universe, int32_t threadCount, QWidget* parent)
@@ -30,18 +31,38 @@ UniverseView::UniverseView(
     fPositionX.resize(size_t(count));
     fPositionY.resize(size_t(count));
     fPositionZ.resize(size_t(count));
-    fTables.resize(size_t(count));
+    fTableOf.resize(size_t(count));
+    std::unordered_map<const ColorTable*, uint8_t> places;
     for (int32_t i = 0; i < count; i++) {
         const StarSystem* system = universe->SystemAt(i);
         fPositionX[size_t(i)] = system->position.x;
         fPositionY[size_t(i)] = system->position.y;
         fPositionZ[size_t(i)] = system->position.z;
         // Generated systems have no table of their own: they are drawn with the G ramp.
-        fTables[size_t(i)] = system->colorTable ? system->colorTable : SpectralTableFor(kClassG);
+        const ColorTable* table
+            = system->colorTable ? system->colorTable : SpectralTableFor(kClassG);
+        if (!fWideTables.empty()) {
+            fWideTables[size_t(i)] = table;
+            continue;
+        }
+        const auto [place, added] = places.try_emplace(table, uint8_t(fTableList.size()));
+        if (added && fTableList.size() == 256) {
+            // One table too many for a byte: every system gets its pointer.
+            fWideTables.resize(size_t(count));
+            for (int32_t j = 0; j < i; j++)
+                fWideTables[size_t(j)] = fTableList[fTableOf[size_t(j)]];
+            fWideTables[size_t(i)] = table;
+            fTableOf = {};
+            continue;
+        }
+        if (added)
+            fTableList.push_back(table);
+        fTableOf[size_t(i)] = place->second;
     }
     userMask = new StarSysMask(count, true, 0);
     distanceMask = new StarSysMask(count, true, 0);
     drawMask = new StarSysMask(count, true, 0);
+    RebuildPassLum();
 
     pitch.InitXRotation(-0.52);
     yaw.InitIdentity();
@@ -81,6 +102,7 @@ void UniverseView::RebuildDrawMask()
 {
     *drawMask = *userMask;
     *drawMask &= *distanceMask;
+    RebuildPassLum();
 }
 
 void UniverseView::MouseMoved(QPoint where, Transit transit)

@@ -146,6 +146,11 @@ public:
             std::min(int32_t(fPositionX.size()), drawMask->GetSystemCount()) };
     }
     const BRect& Frame() const { return frame; }
+    // The colour table system i is drawn with.
+    const ColorTable* TableOf(int32_t i) const
+    {
+        return fWideTables.empty() ? fTableList[fTableOf[size_t(i)]] : fWideTables[size_t(i)];
+    }
     const char* DataString() const { return starInfo.IGetInfo(); }
     // Replaces the real drag (which runs until the button is let go) with a function that gets
     // the message the drag would carry; for tests.
@@ -274,7 +279,20 @@ private:
     // What the star pass reads of each system, packed: the universe never changes, and reading
     // three arrays costs far less than visiting a million heap objects every frame.
     std::vector<double> fPositionX, fPositionY, fPositionZ; // parsecs
-    std::vector<const ColorTable*> fTables; // not owned
+    // Each system's colour table, as its place in fTableList: a byte a system, so the few
+    // systems a frame draws find their tables in an array an eighth the size of one of pointers,
+    // which stays in the cache. A universe of more than 256 tables keeps a pointer a system in
+    // fWideTables instead.
+    std::vector<uint8_t> fTableOf;
+    // What the star pass's coarse test reads of each system in place of its draw-mask state
+    // and its brightness, half the bytes: kPassHidden, kPassDark when the brightness can draw
+    // nothing (negative, or not a number), else the brightness as a float never below it.
+    // Kept by RebuildDrawMask and CalculateLumCache.
+    std::vector<float> fPassLum;
+    static constexpr float kPassHidden = -1.0f, kPassDark = -0.5f;
+    void RebuildPassLum();
+    std::vector<const ColorTable*> fTableList; // not owned
+    std::vector<const ColorTable*> fWideTables; // not owned; empty while fTableOf serves
     FrameHandOver fFrames { this }; // finished frames on their way to the GUI thread
     // A press in progress: the target it began on and where, sampled every 50 ms.
     QTimer fPressTimer;

@@ -6,8 +6,10 @@
 #include "core/Truncate.h"
 #include "render/AsciiText.h"
 
+#include <algorithm>
 #include <cmath>
 #include <cstdio>
+#include <limits>
 #include <string>
 
 namespace {
@@ -49,6 +51,25 @@ void UniverseView::CalculateLumCache()
     const double contrast = stellarContrast.load(std::memory_order_relaxed);
     for (size_t i = 0; i < lumCache.size(); i++)
         lumCache[i] = factor * LumPow(universe->SystemAt(int32_t(i))->luminosity, contrast);
+    RebuildPassLum();
+}
+
+void UniverseView::RebuildPassLum()
+{
+    const size_t count = std::min(lumCache.size(), size_t(drawMask->GetSystemCount()));
+    fPassLum.resize(count);
+    for (size_t i = 0; i < count; i++) {
+        const double lum = lumCache[i];
+        float pass = kPassDark;
+        if (lum > double(std::numeric_limits<float>::max()))
+            pass = std::numeric_limits<float>::infinity();
+        else if (lum >= 0) {
+            pass = float(lum);
+            if (double(pass) < lum)
+                pass = std::nextafter(pass, std::numeric_limits<float>::infinity());
+        }
+        fPassLum[i] = drawMask->states[i] ? pass : kPassHidden;
+    }
 }
 
 void UniverseView::NextTransform()

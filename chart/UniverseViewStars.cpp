@@ -45,9 +45,10 @@ struct Camera {
 // pixel of the frame; those on screen are projected afterwards by the very arithmetic of the
 // rule. No branches, so the compiler vectorises it: all tests every time, joined, since which
 // systems are on screen is not predictable and mispredicted jumps cost more than comparisons.
+// lum is what UniverseView::fPassLum holds: the draw mask and the brightness in one float.
 __attribute__((optimize("fp-contract=fast"))) inline void Flag(const double* __restrict px,
-    const double* __restrict py, const double* __restrict pz, const uint8_t* __restrict shown,
-    const double* __restrict lum, int32_t n, const Camera c, uint8_t* __restrict near)
+    const double* __restrict py, const double* __restrict pz, const float* __restrict lum,
+    int32_t n, const Camera c, uint8_t* __restrict near)
 {
     const uint8_t everyOne = c.everyOne;
     for (int32_t j = 0; j < n; j++) {
@@ -55,9 +56,13 @@ __attribute__((optimize("fp-contract=fast"))) inline void Flag(const double* __r
         const double tx = c.m00 * x + c.m01 * y + c.m02 * z + c.m03;
         const double ty = c.m10 * x + c.m11 * y + c.m12 * z + c.m13;
         const double tz = c.m20 * x + c.m21 * y + c.m22 * z + c.m23;
-        // Bright enough with a margin of a millionth, far beyond the rounding.
-        const uint8_t bright = uint8_t(lum[j] * (1 + 1e-6) >= tz * tz) | everyOne;
-        near[j] = uint8_t((shown[j] != 0) & (tz > 0) & (std::fabs(tx) <= c.reachX * tz)
+        const double l = lum[j];
+        // Shown: above both marks (-1 hidden, -0.5 too dark to draw).
+        const uint8_t shown = uint8_t(l > -0.75);
+        // Bright enough with a margin of a millionth, far beyond the rounding; the float is
+        // never below the brightness it stands for.
+        const uint8_t bright = uint8_t(l * (1 + 1e-6) >= tz * tz) | everyOne;
+        near[j] = uint8_t(shown & (tz > 0) & (std::fabs(tx) <= c.reachX * tz)
             & (std::fabs(ty) <= c.reachY * tz) & bright);
     }
 }
@@ -65,27 +70,26 @@ __attribute__((optimize("fp-contract=fast"))) inline void Flag(const double* __r
 // Flags n consecutive systems from index first on: one version for processors with AVX2 and
 // FMA (four doubles a step), one for any x86-64 (two).
 ND_VECTOR_CLONES __attribute__((optimize("fp-contract=fast"))) void FlagChunk(const double* px,
-    const double* py, const double* pz, const uint8_t* shown, const double* lum, int32_t first,
-    int32_t n, const Camera& c, uint8_t* near)
+    const double* py, const double* pz, const float* lum, int32_t first, int32_t n, const Camera& c,
+    uint8_t* near)
 {
-    Flag(px + first, py + first, pz + first, shown + first, lum + first, n, c, near);
+    Flag(px + first, py + first, pz + first, lum + first, n, c, near);
 }
 
 // Flags n systems from index first on, every step-th: gathered into a chunk first.
-void FlagStrided(const double* px, const double* py, const double* pz, const uint8_t* shown,
-    const double* lum, int32_t first, int32_t n, int32_t step, const Camera& c, uint8_t* near)
+void FlagStrided(const double* px, const double* py, const double* pz, const float* lum,
+    int32_t first, int32_t n, int32_t step, const Camera& c, uint8_t* near)
 {
-    double x[kChunk], y[kChunk], z[kChunk], l[kChunk];
-    uint8_t s[kChunk];
+    double x[kChunk], y[kChunk], z[kChunk];
+    float l[kChunk];
     for (int32_t j = 0; j < n; j++) {
         const int32_t i = first + j * step;
         x[j] = px[i];
         y[j] = py[i];
         z[j] = pz[i];
-        s[j] = shown[i];
         l[j] = lum[i];
     }
-    Flag(x, y, z, s, l, n, c, near);
+    Flag(x, y, z, l, n, c, near);
 }
 
 // The places in the chunk of the flagged systems, in order; how many there are. Few are in the
@@ -130,7 +134,7 @@ void UniverseView::RenderShareInto(RBitmap8* target, int32_t shares, int32_t sha
 
 void UniverseView::RenderSpan(RBitmap8* target, int32_t begin, int32_t end, int32_t step)
 {
-    end = std::min({ end, int32_t(fPositionX.size()), drawMask->GetSystemCount() });
+    end = std::min({ end, int32_t(fPositionX.size()), int32_t(fPassLum.size()) });
     const auto& m = transform.m;
     const Camera camera { m[0][0], m[0][1], m[0][2], m[0][3], m[1][0], m[1][1], m[1][2], m[1][3],
         m[2][0], m[2][1], m[2][2], m[2][3], focalLength, frame.right * 0.5, frame.bottom * 0.5,
@@ -141,25 +145,65 @@ void UniverseView::RenderSpan(RBitmap8* target, int32_t begin, int32_t end, int3
     const float my = mousePointY.load(std::memory_order_relaxed);
     const int32_t selected = selectedSystem.load(std::memory_order_relaxed);
 
-    alignas(8) uint8_t near[kChunk];
-    int32_t places[kChunk];
     const double* px = fPositionX.data();
     const double* py = fPositionY.data();
     const double* pz = fPositionZ.data();
-    for (int32_t first = begin; first < end; first += kChunk * step) {
+    // Flags the chunk from first on and writes the places of its flagged systems; returns how
+    // many there are. Their brightnesses and tables, which the coarse test did not read, are
+    // fetched into the cache meanwhile: the chunk is drawn after the next one is flagged.
+    alignas(8) uint8_t near[kChunk];
+    const auto flagChunk = [&](int32_t first, int32_t* places) {
         const int32_t n = std::min(kChunk, (end - first + step - 1) / step);
         if (step == 1)
-            FlagChunk(px, py, pz, drawMask->states, lumCache.data(), first, n, camera, near);
+            FlagChunk(px, py, pz, fPassLum.data(), first, n, camera, near);
         else
-            FlagStrided(
-                px, py, pz, drawMask->states, lumCache.data(), first, n, step, camera, near);
+            FlagStrided(px, py, pz, fPassLum.data(), first, n, step, camera, near);
         // A short last chunk: the flags past its end up to the next eight say off screen.
         std::memset(near + n, 0, size_t((8 - n % 8) % 8));
         // The selection's place on the screen is noted however faint it is.
         if (selected >= first && selected < first + n * step && (selected - first) % step == 0)
             near[(selected - first) / step] = 1;
         const int32_t flagged = Flagged(near, n, places);
-
+        for (int32_t v = 0; v < flagged; v++) {
+            const size_t i = size_t(first + places[v] * step);
+            __builtin_prefetch(&lumCache[i]);
+            if (!fTableOf.empty())
+                __builtin_prefetch(&fTableOf[i]);
+        }
+        return flagged;
+    };
+    // What is to be drawn, in order, since the order of additive pixels matters: a point of
+    // brightness 1 to 15, or a glow of side -brightness. Drawn a few dozen at a time, their
+    // pixels fetched first: pixels far apart on screen each miss the cache, and the misses of
+    // one batch overlap where those of single draws between flag passes would not.
+    struct Queued {
+        int32_t x, y;
+        const ColorTable* table;
+        int32_t brightness;
+    };
+    constexpr int32_t kQueue = 32;
+    Queued queue[kQueue];
+    int32_t queued = 0;
+    uint8_t* const bits = target->Bits();
+    const int32_t rowBytes = target->BytesPerRow();
+    const int32_t rows = rowBytes > 0 ? target->BitsLength() / rowBytes : 0;
+    const auto drawQueued = [&] {
+        for (int32_t k = 0; k < queued; k++) {
+            const Queued& q = queue[k];
+            if (q.y >= 0 && q.y < rows && q.x >= 0 && q.x < rowBytes)
+                __builtin_prefetch(bits + q.y * rowBytes + q.x, 1);
+        }
+        for (int32_t k = 0; k < queued; k++) {
+            const Queued& q = queue[k];
+            if (q.brightness > 0)
+                target->RenderPointAdd(q.x, q.y, q.table, uint8_t(8 * q.brightness));
+            else
+                target->RenderBitmapAdd(q.x + q.brightness / 2, q.y + q.brightness / 2, starSprite,
+                    -q.brightness, q.table);
+        }
+        queued = 0;
+    };
+    const auto drawChunk = [&](int32_t first, const int32_t* places, int32_t flagged) {
         for (int32_t v = 0; v < flagged; v++) {
             // The rule's own arithmetic, rounded as it rounds (this file fuses nothing): the
             // transform as SMatrix::Transform does it, then sx = trunc(x f / z + right / 2).
@@ -172,7 +216,7 @@ void UniverseView::RenderSpan(RBitmap8* target, int32_t begin, int32_t end, int3
             const double syf = -ty * camera.f / z + camera.cy;
             if (!(z > 0 && sxf >= 1 && sxf < camera.right && syf >= 1 && syf < camera.bottom))
                 continue;
-            const ColorTable* table = fTables[size_t(i)];
+            const ColorTable* table = TableOf(i);
             const int32_t sx = TruncateToInt32(sxf), sy = TruncateToInt32(syf);
 
             // The nearest system whose 8 x 8 pick box holds the mouse becomes the target.
@@ -191,15 +235,30 @@ void UniverseView::RenderSpan(RBitmap8* target, int32_t begin, int32_t end, int3
             if (table && b < 16.0) {
                 const auto brightness = static_cast<int32_t>(b);
                 if (brightness >= 1)
-                    target->RenderPointAdd(sx, sy, table, uint8_t(8 * brightness));
+                    queue[queued++] = { sx, sy, table, brightness };
             } else if (table) {
-                const int32_t size = GlowSize(b);
-                target->RenderBitmapAdd(sx - size / 2, sy - size / 2, starSprite, size, table);
+                queue[queued++] = { sx, sy, table, -GlowSize(b) };
             }
+            if (queued == kQueue)
+                drawQueued();
             if (i == selected) {
                 selectedPointX.store(float(sx), std::memory_order_relaxed);
                 selectedPointY.store(float(sy), std::memory_order_relaxed);
             }
         }
+    };
+
+    int32_t places[2][kChunk];
+    int32_t drawFirst = 0, drawFlagged = 0, slot = 0;
+    for (int32_t first = begin;; first += kChunk * step) {
+        const bool more = first < end;
+        const int32_t flagged = more ? flagChunk(first, places[slot ^ 1]) : 0;
+        drawChunk(drawFirst, places[slot], drawFlagged);
+        if (!more)
+            break;
+        drawFirst = first;
+        drawFlagged = flagged;
+        slot ^= 1;
     }
+    drawQueued();
 }

@@ -34,6 +34,8 @@ protected:
         const BRect& frame = view->Frame();
         for (int32_t i = 0; i < view->universe->CountItems(); i++) {
             const StarSystem* system = view->universe->SystemAt(i);
+            if (!view->drawMask->GetStateSafe(i))
+                continue;
             SVector p = system->position;
             view->transform.Transform(&p);
             if (!(p.z > 0))
@@ -62,16 +64,24 @@ protected:
     }
 };
 
-TEST_F(StarPassRuleTest, EveryViewDrawsWhatTheRuleDrawsPixelForPixel)
+// Systems spread through a cube of 120 pc about the Sun, with magnitudes from -4 to 16.
+std::vector<TestSystem> Scattered(int count, uint64_t seed)
 {
-    std::mt19937_64 random(20261124);
+    std::mt19937_64 random(seed);
     std::uniform_real_distribution<double> coordinate(-60, 60), magnitude(-4, 16);
     const char* classes[] = { "O5V", "B2V", "A0V", "F5V", "G2V", "K5V", "M4V" };
     std::vector<TestSystem> systems;
-    for (int i = 0; i < 30000; i++) {
+    for (int i = 0; i < count; i++) {
         systems.push_back({ "S" + std::to_string(i), coordinate(random), coordinate(random),
             coordinate(random), magnitude(random), classes[random() % 7] });
     }
+    return systems;
+}
+
+TEST_F(StarPassRuleTest, EveryViewDrawsWhatTheRuleDrawsPixelForPixel)
+{
+    std::mt19937_64 random(20261124);
+    std::vector<TestSystem> systems = Scattered(30000, 20261124);
     // Straight down the z axis from 25 pc back, single pixels (luminosity 1 at depth 25) within a
     // few units of the last place of pixel borders and of the frame's edges, x f / z + right / 2 =
     // k + d with |d| < 1e-13: there a product or quotient rounded otherwise than the rule's lands
@@ -118,4 +128,70 @@ TEST_F(StarPassRuleTest, EveryViewDrawsWhatTheRuleDrawsPixelForPixel)
     }
     // The views are not empty: thousands of pixels lit in all.
     EXPECT_GT(drawn, 5000);
+}
+
+// Hidden systems are not drawn, faint ones neither (while the mouse is in the view they are all
+// looked at, and draw nothing all the same), and the brightness and the contrast move what is
+// drawn: the coarse test reads the mask and the brightness in one array, kept as they change.
+TEST_F(StarPassRuleTest, HiddenFaintAndBrightenedSystemsDrawAsTheRuleDraws)
+{
+    Universe* u = MakeUniverse(Scattered(20000, 7));
+    UniverseView* view = MakeView(u, 1, 200);
+    view->showClipSphere = false;
+    view->CalculateLumCache();
+    view->HideGreaterThan(40);
+    int hidden = 0;
+    for (int32_t i = 0; i < u->CountItems(); i++)
+        hidden += !view->drawMask->GetStateSafe(i);
+    ASSERT_GT(hidden, 5000);
+
+    const auto drawnPixels = [](const std::vector<uint8_t>& pixels) {
+        return std::count_if(pixels.begin(), pixels.end(), [](uint8_t p) { return p != 0; });
+    };
+    view->Render();
+    const std::vector<uint8_t> dim = RulePicture(view);
+    EXPECT_EQ(Pixels(view), dim) << "a part hidden";
+    EXPECT_GT(drawnPixels(dim), 500);
+
+    view->mouseInside = true;
+    view->Render();
+    EXPECT_EQ(Pixels(view), RulePicture(view)) << "the mouse in the view";
+    view->mouseInside = false;
+
+    view->lumFactor = view->lumFactor.load() * 64;
+    view->stellarContrast = 1.5;
+    view->CalculateLumCache();
+    view->Render();
+    const std::vector<uint8_t> bright = RulePicture(view);
+    EXPECT_EQ(Pixels(view), bright) << "brighter, more contrast";
+    EXPECT_GT(drawnPixels(bright), drawnPixels(dim));
+
+    view->HideGreaterThan(1000);
+    view->Render();
+    EXPECT_EQ(Pixels(view), RulePicture(view)) << "all shown again";
+}
+
+// A universe whose systems bring more colour tables than a byte can number: every system is
+// still drawn with its own.
+TEST_F(StarPassRuleTest, ThreeHundredColourTablesEachDrawTheirSystems)
+{
+    Universe* u = MakeUniverse(Scattered(3000, 11));
+    std::vector<ColorTable> tables(300);
+    for (size_t t = 0; t < tables.size(); t++) {
+        tables[t] = *u->SystemAt(0)->colorTable;
+        for (int k = 1; k < 256; k++)
+            tables[t].colors[k] = { uint8_t(k * (t + 1) % 256), uint8_t(t % 256), uint8_t(k), 255 };
+    }
+    for (int32_t i = 0; i < u->CountItems(); i++)
+        u->SystemAt(i)->colorTable = &tables[size_t(i) % tables.size()];
+    UniverseView* view = MakeView(u, 1, 200);
+    view->showClipSphere = false;
+    view->CalculateLumCache();
+    view->Render();
+    const std::vector<uint8_t> rule = RulePicture(view);
+    EXPECT_EQ(Pixels(view), rule);
+    // The picture differs from one drawn with one table for all.
+    for (int32_t i = 0; i < u->CountItems(); i++)
+        u->SystemAt(i)->colorTable = &tables[0];
+    EXPECT_NE(RulePicture(view), rule);
 }
