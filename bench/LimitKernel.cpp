@@ -1,6 +1,7 @@
 // Built like the star pass it is the limit of: -O3, fused multiply-adds only where it fuses them.
 #include "LimitKernel.h"
 
+#include "chart/CoarseCull.h"
 #include "core/VectorClones.h"
 
 #include <algorithm>
@@ -34,6 +35,45 @@ ND_VECTOR_CLONES __attribute__((optimize("fp-contract=fast"))) void Flag(const d
     }
 }
 
+#ifdef ND_COARSE_CULL_AVX2
+// Shown: the draw mask's byte is not 0.
+struct Shown {
+    const uint8_t* shown;
+    __attribute__((target("avx2,fma"))) __m256d operator()(int32_t j, __m256d) const
+    {
+        uint32_t four;
+        std::memcpy(&four, shown + j, sizeof four);
+        const __m256i states = _mm256_cvtepu8_epi64(_mm_cvtsi32_si128(int(four)));
+        const __m256i hidden = _mm256_cmpeq_epi64(states, _mm256_setzero_si256());
+        return _mm256_castsi256_pd(_mm256_xor_si256(hidden, _mm256_set1_epi64x(-1)));
+    }
+};
+#endif
+
+// Sets bit j of words for each system j of the chunk from first on that may be on screen.
+void FlagWords(const UniverseView::StarPassData& data, const SMatrix& transform, double reachX,
+    double reachY, int32_t first, int32_t n, uint64_t* words)
+{
+    int32_t done = 0;
+#ifdef ND_COARSE_CULL_AVX2
+    if (CoarseCullHasAvx2()) {
+        const auto& m = transform.m;
+        const CoarseCamera camera { m[0][0], m[0][1], m[0][2], m[0][3], m[1][0], m[1][1], m[1][2],
+            m[1][3], m[2][0], m[2][1], m[2][2], m[2][3], reachX, reachY };
+        done = n & ~3;
+        CoarseCullAvx2(data.x + first, data.y + first, data.z + first, done, camera,
+            Shown { data.shown + first }, words);
+    }
+#endif
+    if (done < n) {
+        uint8_t near[kChunk];
+        Flag(data.x + first + done, data.y + first + done, data.z + first + done,
+            data.shown + first + done, n - done, transform, reachX, reachY, near);
+        for (int32_t r = 0; r < n - done; r++)
+            words[(done + r) / 64] |= uint64_t(near[r]) << ((done + r) % 64);
+    }
+}
+
 } // namespace
 
 int64_t LimitKernel(const UniverseView::StarPassData& data, const SMatrix& transform,
@@ -43,20 +83,15 @@ int64_t LimitKernel(const UniverseView::StarPassData& data, const SMatrix& trans
     const double f = focalLength, right = frame.right, bottom = frame.bottom;
     const double cx = right * 0.5, cy = bottom * 0.5;
     const double reachX = (cx + 1) / f, reachY = (cy + 1) / f;
-    alignas(8) uint8_t near[kChunk];
     int64_t visible = 0;
     for (int32_t first = 0; first < data.count; first += kChunk) {
         const int32_t n = std::min(kChunk, data.count - first);
-        Flag(data.x + first, data.y + first, data.z + first, data.shown + first, n, transform,
-            reachX, reachY, near);
-        std::memset(near + n, 0, size_t((8 - n % 8) % 8));
+        uint64_t words[kChunk / 64] = {};
+        FlagWords(data, transform, reachX, reachY, first, n, words);
         // The few flagged are projected and, when on screen, add one to their pixel.
-        for (int32_t j = 0; j < n; j += 8) {
-            uint64_t eight;
-            std::memcpy(&eight, near + j, sizeof eight);
-            while (eight != 0) {
-                const int32_t i = first + j + std::countr_zero(eight) / 8;
-                eight &= eight - 1;
+        for (int32_t w = 0; w < (n + 63) / 64; w++) {
+            for (uint64_t bits = words[w]; bits != 0; bits &= bits - 1) {
+                const int32_t i = first + w * 64 + std::countr_zero(bits);
                 const double x = data.x[i], y = data.y[i], z = data.z[i];
                 const double tx = m[0][0] * x + m[0][1] * y + m[0][2] * z + m[0][3];
                 const double ty = m[1][0] * x + m[1][1] * y + m[1][2] * z + m[1][3];

@@ -3,6 +3,8 @@
 // with -O3 so the transform-and-cull loop is vectorised.
 #include "chart/UniverseView.h"
 
+#include "chart/CoarseCull.h"
+
 #include "core/Truncate.h"
 #include "core/VectorClones.h"
 
@@ -92,22 +94,48 @@ void FlagStrided(const double* px, const double* py, const double* pz, const flo
     Flag(x, y, z, l, n, c, near);
 }
 
-// The places in the chunk of the flagged systems, in order; how many there are. Few are in the
-// usual view, so the flags are read eight at a time and only the set ones visited, lowest
-// first (a flag is 0 or 1: one bit a set byte). The flags run to a multiple of eight.
-int32_t Flagged(const uint8_t* near, int32_t n, int32_t* places)
+// Sets bit j of words for every flag near[j] of the n given (the flags run to a multiple of
+// eight; a flag is 0 or 1, one bit a set byte).
+void FlagsToWords(const uint8_t* near, int32_t n, uint64_t* words)
 {
-    int32_t count = 0;
     for (int32_t j = 0; j < n; j += 8) {
         uint64_t eight;
         std::memcpy(&eight, near + j, sizeof eight);
-        while (eight != 0) {
-            places[count++] = j + std::countr_zero(eight) / 8;
-            eight &= eight - 1;
-        }
+        // Byte k's low bit to bit k of the top byte.
+        words[j / 64] |= ((eight * 0x0102040810204080u) >> 56) << (j % 64);
+    }
+}
+
+// The places in the chunk of the flagged systems, in order; how many there are. Few are in the
+// usual view, so only the set bits are visited, lowest first.
+int32_t Flagged(const uint64_t* words, int32_t n, int32_t* places)
+{
+    int32_t count = 0;
+    for (int32_t w = 0; w < (n + 63) / 64; w++) {
+        for (uint64_t bits = words[w]; bits != 0; bits &= bits - 1)
+            places[count++] = w * 64 + std::countr_zero(bits);
     }
     return count;
 }
+
+#ifdef ND_COARSE_CULL_AVX2
+// What the frame's coarse test asks beyond the frame: shown and bright enough, from the float
+// of UniverseView::fPassLum, as Flag asks it.
+struct ShownAndBright {
+    const float* lum;
+    bool everyOne;
+    __attribute__((target("avx2,fma"))) __m256d operator()(int32_t j, __m256d tz) const
+    {
+        const __m256d l = _mm256_cvtps_pd(_mm_loadu_ps(lum + j));
+        const __m256d shown = _mm256_cmp_pd(l, _mm256_set1_pd(-0.75), _CMP_GT_OQ);
+        __m256d bright = _mm256_cmp_pd(
+            _mm256_mul_pd(l, _mm256_set1_pd(1 + 1e-6)), _mm256_mul_pd(tz, tz), _CMP_GE_OQ);
+        if (everyOne)
+            bright = _mm256_castsi256_pd(_mm256_set1_epi64x(-1));
+        return _mm256_and_pd(shown, bright);
+    }
+};
+#endif
 
 } // namespace
 
@@ -151,19 +179,42 @@ void UniverseView::RenderSpan(RBitmap8* target, int32_t begin, int32_t end, int3
     // Flags the chunk from first on and writes the places of its flagged systems; returns how
     // many there are. Their brightnesses and tables, which the coarse test did not read, are
     // fetched into the cache meanwhile: the chunk is drawn after the next one is flagged.
-    alignas(8) uint8_t near[kChunk];
+    const CoarseCamera coarse { camera.m00, camera.m01, camera.m02, camera.m03, camera.m10,
+        camera.m11, camera.m12, camera.m13, camera.m20, camera.m21, camera.m22, camera.m23,
+        camera.reachX, camera.reachY };
     const auto flagChunk = [&](int32_t first, int32_t* places) {
         const int32_t n = std::min(kChunk, (end - first + step - 1) / step);
-        if (step == 1)
-            FlagChunk(px, py, pz, fPassLum.data(), first, n, camera, near);
-        else
-            FlagStrided(px, py, pz, fPassLum.data(), first, n, step, camera, near);
-        // A short last chunk: the flags past its end up to the next eight say off screen.
-        std::memset(near + n, 0, size_t((8 - n % 8) % 8));
+        uint64_t words[kChunk / 64] = {};
+        int32_t done = 0;
+#ifdef ND_COARSE_CULL_AVX2
+        if (step == 1 && CoarseCullHasAvx2()) {
+            done = n & ~3;
+            CoarseCullAvx2(px + first, py + first, pz + first, done, coarse,
+                ShownAndBright { fPassLum.data() + first, camera.everyOne }, words);
+        }
+#endif
+        if (done < n) {
+            // The rest (a chunk's last few systems, or all of them) a byte a system.
+            alignas(8) uint8_t near[kChunk];
+            const int32_t rest = n - done;
+            if (step == 1)
+                FlagChunk(px, py, pz, fPassLum.data(), first + done, rest, camera, near);
+            else
+                FlagStrided(px, py, pz, fPassLum.data(), first, rest, step, camera, near);
+            // The flags past the last up to the next eight say off screen.
+            std::memset(near + rest, 0, size_t((8 - rest % 8) % 8));
+            if (done == 0)
+                FlagsToWords(near, rest, words);
+            else
+                for (int32_t r = 0; r < rest; r++)
+                    words[(done + r) / 64] |= uint64_t(near[r]) << ((done + r) % 64);
+        }
         // The selection's place on the screen is noted however faint it is.
-        if (selected >= first && selected < first + n * step && (selected - first) % step == 0)
-            near[(selected - first) / step] = 1;
-        const int32_t flagged = Flagged(near, n, places);
+        if (selected >= first && selected < first + n * step && (selected - first) % step == 0) {
+            const int32_t j = (selected - first) / step;
+            words[j / 64] |= uint64_t(1) << (j % 64);
+        }
+        const int32_t flagged = Flagged(words, n, places);
         for (int32_t v = 0; v < flagged; v++) {
             const size_t i = size_t(first + places[v] * step);
             __builtin_prefetch(&lumCache[i]);

@@ -4,6 +4,7 @@
 // pixels and of the frame, where a rounding different from the rule's would show.
 #include "ChartFixture.h"
 
+#include "chart/CoarseCull.h"
 #include "core/Truncate.h"
 
 #include <bit>
@@ -25,6 +26,8 @@ int32_t RuleGlowSize(double b)
 
 class StarPassRuleTest : public ChartTest {
 protected:
+    void EveryView();
+
     // What the rule draws for every system of the view's universe in its present transform, in
     // the order of the systems, into a bitmap of the view's frame.
     std::vector<uint8_t> RulePicture(UniverseView* view)
@@ -64,6 +67,8 @@ protected:
     }
 };
 
+namespace {
+
 // Systems spread through a cube of 120 pc about the Sun, with magnitudes from -4 to 16.
 std::vector<TestSystem> Scattered(int count, uint64_t seed)
 {
@@ -78,7 +83,10 @@ std::vector<TestSystem> Scattered(int count, uint64_t seed)
     return systems;
 }
 
-TEST_F(StarPassRuleTest, EveryViewDrawsWhatTheRuleDrawsPixelForPixel)
+} // namespace
+
+// The views of the test below, drawn with the coarse test at hand.
+void StarPassRuleTest::EveryView()
 {
     std::mt19937_64 random(20261124);
     std::vector<TestSystem> systems = Scattered(30000, 20261124);
@@ -129,6 +137,21 @@ TEST_F(StarPassRuleTest, EveryViewDrawsWhatTheRuleDrawsPixelForPixel)
     // The views are not empty: thousands of pixels lit in all.
     EXPECT_GT(drawn, 5000);
 }
+
+TEST_F(StarPassRuleTest, EveryViewDrawsWhatTheRuleDrawsPixelForPixel)
+{
+    EveryView();
+}
+
+#ifdef ND_COARSE_CULL_AVX2
+// The same views where the processor's vector version of the coarse test is not used.
+TEST_F(StarPassRuleTest, EveryViewDrawsTheSameWithoutTheVectorCoarseTest)
+{
+    gCoarseCullPlain = true;
+    EveryView();
+    gCoarseCullPlain = false;
+}
+#endif
 
 // Hidden systems are not drawn, faint ones neither (while the mouse is in the view they are all
 // looked at, and draw nothing all the same), and the brightness and the contrast move what is

@@ -1,0 +1,75 @@
+// The star pass's coarse test written out for processors with AVX2 and FMA: four systems a
+// step, and the answers as bits, one a system, straight from the comparisons (what the
+// compiler makes of the plain loop spends a quarter of its work packing them into bytes).
+// Which systems pass may round as it likes: a system on screen always passes, by a pixel of
+// margin a thousand times what rounding can move it; those that pass are projected afterwards
+// by the exact rule.
+#pragma once
+
+#include <atomic>
+#include <cstdint>
+
+#if defined(__x86_64__) && defined(__GNUC__)
+#include <immintrin.h>
+#define ND_COARSE_CULL_AVX2 1
+#endif
+
+// The rows of the transform that the test needs, and how far from the view axis, in units of
+// depth, a point still lands within a pixel of the frame.
+struct CoarseCamera {
+    double m00, m01, m02, m03, m10, m11, m12, m13, m20, m21, m22, m23;
+    double reachX, reachY;
+};
+
+#ifdef ND_COARSE_CULL_AVX2
+
+// Set, the version below is not used even where it could be (for tests of the other).
+inline std::atomic<bool> gCoarseCullPlain { false };
+
+// Whether the version below is to run: the processor has what it needs, and it is not turned off.
+inline bool CoarseCullHasAvx2()
+{
+    static const bool has = __builtin_cpu_supports("avx2") && __builtin_cpu_supports("fma");
+    return has && !gCoarseCullPlain.load(std::memory_order_relaxed);
+}
+
+// For j below n (a multiple of 4 up to 256 past the start), sets bit j of words when system j
+// is in front and within the reach, and more() says it counts: more(j, tz) gives a mask of
+// four lanes, all ones where systems j to j + 3 count. Bits past n are left clear; words holds
+// (n + 63) / 64 words.
+template <class More>
+__attribute__((target("avx2,fma"))) inline void CoarseCullAvx2(const double* px, const double* py,
+    const double* pz, int32_t n, const CoarseCamera& c, const More& more, uint64_t* words)
+{
+    const __m256d m00 = _mm256_set1_pd(c.m00), m01 = _mm256_set1_pd(c.m01);
+    const __m256d m02 = _mm256_set1_pd(c.m02), m03 = _mm256_set1_pd(c.m03);
+    const __m256d m10 = _mm256_set1_pd(c.m10), m11 = _mm256_set1_pd(c.m11);
+    const __m256d m12 = _mm256_set1_pd(c.m12), m13 = _mm256_set1_pd(c.m13);
+    const __m256d m20 = _mm256_set1_pd(c.m20), m21 = _mm256_set1_pd(c.m21);
+    const __m256d m22 = _mm256_set1_pd(c.m22), m23 = _mm256_set1_pd(c.m23);
+    const __m256d reachX = _mm256_set1_pd(c.reachX), reachY = _mm256_set1_pd(c.reachY);
+    const __m256d zero = _mm256_setzero_pd();
+    const __m256d magnitude = _mm256_castsi256_pd(_mm256_set1_epi64x(0x7fffffffffffffff));
+    for (int32_t w = 0; w < (n + 63) / 64; w++)
+        words[w] = 0;
+    for (int32_t j = 0; j < n; j += 4) {
+        const __m256d x = _mm256_loadu_pd(px + j), y = _mm256_loadu_pd(py + j);
+        const __m256d z = _mm256_loadu_pd(pz + j);
+        const __m256d tx
+            = _mm256_fmadd_pd(m00, x, _mm256_fmadd_pd(m01, y, _mm256_fmadd_pd(m02, z, m03)));
+        const __m256d ty
+            = _mm256_fmadd_pd(m10, x, _mm256_fmadd_pd(m11, y, _mm256_fmadd_pd(m12, z, m13)));
+        const __m256d tz
+            = _mm256_fmadd_pd(m20, x, _mm256_fmadd_pd(m21, y, _mm256_fmadd_pd(m22, z, m23)));
+        // Ordered comparisons: not a number fails every one, as it fails the exact test.
+        __m256d pass = _mm256_cmp_pd(tz, zero, _CMP_GT_OQ);
+        pass = _mm256_and_pd(pass,
+            _mm256_cmp_pd(_mm256_and_pd(tx, magnitude), _mm256_mul_pd(reachX, tz), _CMP_LE_OQ));
+        pass = _mm256_and_pd(pass,
+            _mm256_cmp_pd(_mm256_and_pd(ty, magnitude), _mm256_mul_pd(reachY, tz), _CMP_LE_OQ));
+        pass = _mm256_and_pd(pass, more(j, tz));
+        words[j / 64] |= uint64_t(unsigned(_mm256_movemask_pd(pass))) << (j % 64);
+    }
+}
+
+#endif
