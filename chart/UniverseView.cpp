@@ -1,6 +1,7 @@
 // The chart view's construction, its Qt events and the messages it takes.
 #include "chart/UniverseView.h"
 
+#include "chart/FrameLog.h"
 #include "core/MessageCodes.h"
 #include "platform/qt/MessageDrag.h"
 #include "widgets/WidgetGeometry.h"
@@ -133,7 +134,8 @@ void UniverseView::paintEvent(QPaintEvent*)
     if (!window()->isMinimized())
         Resume();
     QPainter painter(this);
-    fFrames.Paint(painter);
+    if (fFrames.Paint(painter))
+        FrameLog::Note("paint", this);
 }
 
 void UniverseView::resizeEvent(QResizeEvent*)

@@ -2,6 +2,7 @@
 // frames to the GUI thread.
 #include "chart/UniverseView.h"
 
+#include "chart/FrameLog.h"
 #include "platform/Kernel.h"
 
 #include <chrono>
@@ -192,6 +193,7 @@ void UniverseView::MainRenderLoop()
 
     while (running) {
         const bigtime_t t0 = system_time();
+        FrameLog::Note("render", this);
         CollectMissingShares();
         renderLock->Acquire();
         // The settings the controls write are read once a frame.
