@@ -96,7 +96,8 @@ int64_t LimitKernel(const UniverseView::StarPassData& data, const SMatrix& trans
                 const double tx = m[0][0] * x + m[0][1] * y + m[0][2] * z + m[0][3];
                 const double ty = m[1][0] * x + m[1][1] * y + m[1][2] * z + m[1][3];
                 const double tz = m[2][0] * x + m[2][1] * y + m[2][2] * z + m[2][3];
-                const double sx = tx * f / tz + cx, sy = -ty * f / tz + cy;
+                double sx, sy;
+                ExactScreenPoint(tx, ty, tz, f, cx, cy, &sx, &sy);
                 if (tz > 0 && sx >= 1 && sx < right && sy >= 1 && sy < bottom) {
                     pixels[int32_t(sy) * pitch + int32_t(sx)]++;
                     visible++;

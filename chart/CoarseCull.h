@@ -21,6 +21,19 @@ struct CoarseCamera {
     double reachX, reachY;
 };
 
+// The screen point of a system at (tx, ty, z) in the camera's frame, by the rule:
+// x f / z + right / 2 and -y f / z + bottom / 2, each operation rounded as the rule rounds it
+// (built where nothing is fused). The two quotients are taken by one division of pairs, which
+// rounds each as the division of one would, in half the divider's time.
+inline void ExactScreenPoint(
+    double tx, double ty, double z, double f, double cx, double cy, double* sx, double* sy)
+{
+    using Pair = double __attribute__((vector_size(16)));
+    const Pair quotients = Pair { tx * f, -ty * f } / Pair { z, z };
+    *sx = quotients[0] + cx;
+    *sy = quotients[1] + cy;
+}
+
 #ifdef ND_COARSE_CULL_AVX2
 
 // Set, the version below is not used even where it could be (for tests of the other).

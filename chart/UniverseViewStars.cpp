@@ -263,8 +263,8 @@ void UniverseView::RenderSpan(RBitmap8* target, int32_t begin, int32_t end, int3
             const double tx = camera.m00 * x + camera.m01 * y + camera.m02 * zw + camera.m03;
             const double ty = camera.m10 * x + camera.m11 * y + camera.m12 * zw + camera.m13;
             const double z = camera.m20 * x + camera.m21 * y + camera.m22 * zw + camera.m23;
-            const double sxf = tx * camera.f / z + camera.cx;
-            const double syf = -ty * camera.f / z + camera.cy;
+            double sxf, syf;
+            ExactScreenPoint(tx, ty, z, camera.f, camera.cx, camera.cy, &sxf, &syf);
             if (!(z > 0 && sxf >= 1 && sxf < camera.right && syf >= 1 && syf < camera.bottom))
                 continue;
             const ColorTable* table = TableOf(i);
