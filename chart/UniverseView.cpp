@@ -60,6 +60,10 @@ UniverseView::UniverseView(
             fTableList.push_back(table);
         fTableOf[size_t(i)] = place->second;
     }
+    for (const ColorTable* table : fTableList)
+        fSpreads.push_back(table ? RBitmap8::SpreadTable(table) : std::array<uint32_t, 256> {});
+    for (int32_t size = 0; size <= 64; size++)
+        fGlowSamples.push_back(RBitmap8::ScaledSamples(starSprite, size));
     userMask = new StarSysMask(count, true, 0);
     distanceMask = new StarSysMask(count, true, 0);
     drawMask = new StarSysMask(count, true, 0);

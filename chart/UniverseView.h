@@ -293,6 +293,11 @@ private:
     void RebuildPassLum();
     std::vector<const ColorTable*> fTableList; // not owned
     std::vector<const ColorTable*> fWideTables; // not owned; empty while fTableOf serves
+    // The glow scaled to each side from 0 to 64 (RBitmap8::ScaledSamples), and the tables of
+    // fTableList in the additive form: a glow is then drawn without scaling or converting
+    // anything. No spreads while fWideTables serves; no samples without the glow's resource.
+    std::vector<std::vector<uint8_t>> fGlowSamples;
+    std::vector<std::array<uint32_t, 256>> fSpreads;
     FrameHandOver fFrames { this }; // finished frames on their way to the GUI thread
     // A press in progress: the target it began on and where, sampled every 50 ms.
     QTimer fPressTimer;

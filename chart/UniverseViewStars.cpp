@@ -231,6 +231,7 @@ void UniverseView::RenderSpan(RBitmap8* target, int32_t begin, int32_t end, int3
         int32_t x, y;
         const ColorTable* table;
         int32_t brightness;
+        const uint32_t* spread; // the table in the additive form, when there is one
     };
     constexpr int32_t kQueue = 32;
     Queued queue[kQueue];
@@ -248,6 +249,9 @@ void UniverseView::RenderSpan(RBitmap8* target, int32_t begin, int32_t end, int3
             const Queued& q = queue[k];
             if (q.brightness > 0)
                 target->RenderPointAdd(q.x, q.y, q.table, uint8_t(8 * q.brightness));
+            else if (q.spread && !fGlowSamples[size_t(-q.brightness)].empty())
+                target->RenderSamplesAdd(q.x + q.brightness / 2, q.y + q.brightness / 2,
+                    fGlowSamples[size_t(-q.brightness)].data(), -q.brightness, q.spread);
             else
                 target->RenderBitmapAdd(q.x + q.brightness / 2, q.y + q.brightness / 2, starSprite,
                     -q.brightness, q.table);
@@ -286,9 +290,10 @@ void UniverseView::RenderSpan(RBitmap8* target, int32_t begin, int32_t end, int3
             if (table && b < 16.0) {
                 const auto brightness = static_cast<int32_t>(b);
                 if (brightness >= 1)
-                    queue[queued++] = { sx, sy, table, brightness };
+                    queue[queued++] = { sx, sy, table, brightness, nullptr };
             } else if (table) {
-                queue[queued++] = { sx, sy, table, -GlowSize(b) };
+                queue[queued++] = { sx, sy, table, -GlowSize(b),
+                    fWideTables.empty() ? fSpreads[fTableOf[size_t(i)]].data() : nullptr };
             }
             if (queued == kQueue)
                 drawQueued();

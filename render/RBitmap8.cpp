@@ -376,6 +376,45 @@ void RBitmap8::RenderBitmapAdd(
     }
 }
 
+void RBitmap8::RenderSamplesAdd(
+    int32_t x, int32_t y, const uint8_t* samples, int32_t size, const uint32_t* spread)
+{
+    if (!FitsWhole(x, y, size))
+        return;
+    uint8_t* row = bits + y * bytesPerRow + x;
+    for (int32_t j = 0; j < size; ++j, row += bytesPerRow, samples += size) {
+        for (int32_t i = 0; i < size; ++i) {
+            const uint32_t add = spread[samples[i]];
+            if (add != 0 || !blackKeeps[LoadPixel(row + i)])
+                AddPixel(row + i, add);
+        }
+    }
+}
+
+std::vector<uint8_t> RBitmap8::ScaledSamples(const BBitmap* source, int32_t size)
+{
+    if (size < 1)
+        return {};
+    const Sampler sampler(source, size);
+    if (sampler.lastRow < 0)
+        return {};
+    std::vector<uint8_t> samples(size_t(size) * size_t(size));
+    for (int32_t j = 0; j < size; ++j) {
+        const uint8_t* from = sampler.Row(j);
+        for (int32_t i = 0; i < size; ++i)
+            samples[size_t(j) * size_t(size) + size_t(i)] = from[sampler.Column(i)];
+    }
+    return samples;
+}
+
+std::array<uint32_t, 256> RBitmap8::SpreadTable(const ColorTable* table)
+{
+    std::array<uint32_t, 256> spread;
+    for (size_t v = 0; v < spread.size(); ++v)
+        spread[v] = Spread(table->colors[v]);
+    return spread;
+}
+
 bool RBitmap8::LoadFromResource(int32_t type, int32_t id, int32_t offset, int32_t length)
 {
     if (!ResourcesAvailable())

@@ -19,7 +19,9 @@
 #include "render/ColorTable.h"
 #include "render/SysColorMap.h"
 
+#include <array>
 #include <cstdint>
+#include <vector>
 
 class RBMFont8;
 
@@ -76,6 +78,15 @@ public:
     // The same placement and sampling; each sample v adds table->colors[v] to its pixel.
     void RenderBitmapAdd(
         int32_t x, int32_t y, const BBitmap* source, int32_t size, const ColorTable* table);
+    // What RenderBitmapAdd draws, for a caller that scales a source once and draws it many
+    // times: samples are ScaledSamples(source, size), spread is SpreadTable(table).
+    void RenderSamplesAdd(
+        int32_t x, int32_t y, const uint8_t* samples, int32_t size, const uint32_t* spread);
+    // The samples RenderBitmapAdd takes from source at size, row after row; empty when it
+    // would draw nothing.
+    static std::vector<uint8_t> ScaledSamples(const BBitmap* source, int32_t size);
+    // The colours of table in the form the additive primitives add, one for each intensity.
+    static std::array<uint32_t, 256> SpreadTable(const ColorTable* table);
 
     // Reads length bytes of resource (type, id), from offset into it, straight into the pixel
     // memory (raw rows of bytesPerRow bytes; at most bitsLength bytes). Returns whether the

@@ -399,6 +399,36 @@ TEST(RBitmap8, AdditiveBlitOfBlackChangesWhatAddingBlackChanges)
     std::free(table);
 }
 
+// Scaled once and drawn with a spread table, a blit adds what RenderBitmapAdd adds, at every
+// size up to four times the source and over every palette entry.
+TEST(RBitmap8, SamplesScaledOnceDrawWhatTheScaledBlitDraws)
+{
+    std::mt19937 random(5);
+    RBitmap8 source(BRect(0.0f, 0.0f, 15.0f, 15.0f));
+    for (int i = 0; i < source.BitsLength(); ++i)
+        source.Bits()[i] = uint8_t(i % 3 == 0 ? 0 : random());
+    ColorTable* table = NewTable({ 0, 0, 0, 0 });
+    for (int v = 1; v < 256; ++v)
+        table->colors[v] = { uint8_t(random()), uint8_t(random()), uint8_t(random()), 0 };
+    const std::array<uint32_t, 256> spread = RBitmap8::SpreadTable(table);
+    EXPECT_TRUE(RBitmap8::ScaledSamples(&source, 0).empty());
+    for (int size = 1; size <= 64; ++size) {
+        Canvas blit(70, 70), samples(70, 70);
+        for (int i = 0; i < blit.BitsLength(); ++i)
+            blit.Bits()[i] = samples.Bits()[i] = uint8_t(i);
+        const std::vector<uint8_t> scaled = RBitmap8::ScaledSamples(&source, size);
+        ASSERT_EQ(scaled.size(), size_t(size * size));
+        blit.RenderBitmapAdd(3, 2, &source, size, table);
+        samples.RenderSamplesAdd(3, 2, scaled.data(), size, spread.data());
+        // Not wholly inside: neither draws.
+        blit.RenderBitmapAdd(70 - size + 1, 0, &source, size, table);
+        samples.RenderSamplesAdd(70 - size + 1, 0, scaled.data(), size, spread.data());
+        ASSERT_EQ(std::memcmp(blit.Bits(), samples.Bits(), size_t(blit.BitsLength())), 0)
+            << "size " << size;
+    }
+    std::free(table);
+}
+
 TEST(RBitmap8, TextDrawsOnlyInkAndAdvancesTheCursor)
 {
     Canvas b(12, 8);
