@@ -1,7 +1,7 @@
-// The program as a user meets it after `cmake --install`: started from another folder, with no
-// catalogue beside it and none in the user's data folder, it finds the catalogue installed with
-// it and shows the real sky. The count of systems is read off a list window that holds every
-// system: its empty set dropped on its own NOT pad.
+// The program as a user meets it after `cmake --install`, or unpacked from its package: started
+// from another folder, with no catalogue beside it and none in the user's data folder, it finds the
+// catalogue installed with it and shows the real sky. The count of systems is read off a list
+// window that holds every system: its empty set dropped on its own NOT pad.
 #include "app/LabelReader.h"
 #include "app/ProgramX11Support.h"
 
