@@ -7,6 +7,7 @@
 #include <QCoreApplication>
 #include <QDrag>
 #include <QDropEvent>
+#include <QGuiApplication>
 #include <QPointer>
 #include <QWidget>
 #include <QWindow>
@@ -95,7 +96,10 @@ QDrag* MakeMessageDrag(QWidget* source, MessageMimeData* data, RBitmap8* image, 
     drag->setMimeData(data);
     if (image) {
         drag->setPixmap(DragPixmap(*image));
-        new DragImageShaper(*image, drag); // owned by the drag, lives as long as it does
+        // Only X11 asks for the outline (Wayland composites always); the shaper is owned by the
+        // drag and lives as long as it does.
+        if (QGuiApplication::platformName() == "xcb")
+            new DragImageShaper(*image, drag);
         drag->setHotSpot(QPoint(static_cast<int>(hotSpot.x), static_cast<int>(hotSpot.y)));
     }
     return drag;

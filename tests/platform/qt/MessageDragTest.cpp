@@ -7,7 +7,11 @@
 
 #include <QDrag>
 #include <QDropEvent>
+#include <QGuiApplication>
 #include <QMimeData>
+#include <QMouseEvent>
+#include <QTimer>
+#include <QWindow>
 #include <gtest/gtest.h>
 
 TEST(MessageDrag, ADragCarriesTheMessageAndItsPicture)
@@ -125,4 +129,37 @@ TEST(MessageDrag, ADropKnowsWhenItLandsBackOnTheViewItsDragStartedFrom)
 
     // Once the drag is over, nothing is its source any more.
     EXPECT_FALSE(DroppedOnItsSource(&drop, view));
+}
+
+// The picture of a running drag stands in a window of Qt's own. Only X11 without a compositor
+// needs that window cut to the picture's outline; elsewhere it keeps the shape Qt gives it. Qt's
+// generic drag, the one its Wayland platform builds on, runs on the minimal platform (the
+// headless one runs no drag at all): CTest runs this there.
+TEST(MessageDrag, OffX11ThePictureWindowIsNotCut)
+{
+    if (QGuiApplication::platformName() != "minimal")
+        GTEST_SKIP() << "runs on the minimal platform";
+    QWidget source;
+    source.resize(40, 40);
+    source.show();
+    RBitmap8 image(BRect(0, 0, 31, 31));
+    image.EraseMap(255);
+    image.RenderSquare(11, 11, 10, 63);
+    bool seen = false;
+    QRegion mask;
+    // Runs inside the drag's own event loop: reads the picture's window, then lets go.
+    QTimer::singleShot(100, [&] {
+        for (QWindow* window : QGuiApplication::allWindows()) {
+            if (window->inherits("QShapedPixmapWindow") && window->isVisible()) {
+                seen = true;
+                mask = window->mask();
+            }
+        }
+        QMouseEvent release(QEvent::MouseButtonRelease, QPointF(5, 5), QPointF(5, 5),
+            Qt::LeftButton, Qt::NoButton, Qt::NoModifier);
+        QCoreApplication::sendEvent(&source, &release);
+    });
+    DragMessage(&source, Message(kStarMessage), &image, BPoint(15, 16));
+    ASSERT_TRUE(seen) << "the drag showed no picture";
+    EXPECT_TRUE(mask.isEmpty()) << "the picture's window was cut to its outline";
 }
