@@ -2,6 +2,7 @@
 #include "catalog/CNumbers.h"
 
 #include <algorithm>
+#include <array>
 #include <bit>
 #include <charconv>
 #include <clocale>
@@ -10,6 +11,9 @@
 #include <cstdio>
 #include <cstring>
 #include <locale.h>
+#ifdef __SSE2__
+#include <emmintrin.h>
+#endif
 
 namespace {
 
@@ -129,6 +133,114 @@ constexpr size_t kMaxDigits = 19;
     return q;
 }
 
+#ifdef __SSE2__
+// The inverses of 5^k modulo 2^64: a multiple of 5^k times the inverse gives the quotient
+// exactly, with one multiplication instead of a division.
+constexpr uint64_t InverseModulo64(uint64_t odd)
+{
+    uint64_t inverse = odd; // right to three bits, as odd * odd is 1 modulo 8
+    for (int i = 0; i < 5; i++)
+        inverse *= 2 - odd * inverse; // each step doubles the bits that are right
+    return inverse;
+}
+constexpr auto kInverseFivePowers = [] {
+    std::array<uint64_t, 16> inverses {};
+    uint64_t power = 1;
+    for (uint64_t& inverse : inverses) {
+        inverse = InverseModulo64(power);
+        power *= 5;
+    }
+    return inverses;
+}();
+static_assert(kInverseFivePowers[15] * 30517578125u == 1);
+
+// ScanPlainDecimalWithin for a number whose sixteen characters from p, past its minus, may
+// all be loaded: the whole number at once, in the sixteen bytes of one vector. The characters
+// that are digits or points give the number's length; the point is taken out by moving the
+// digits after it one place left, the places past the last digit are zeroed, and the sixteen
+// digits (as many as the number has, then zeros) are combined pairwise into two eight-digit
+// halves. Their sum is the number's digits times 10^(16 - digits), which is divided exactly by
+// that power: shifted right to divide by 2^k, then multiplied by the inverse of 5^k. Gives
+// exactly what ScanPlainDecimalWithin gives, or null, and then the caller asks it: for longer
+// numbers, two points or no digit at all.
+[[gnu::always_inline]] inline const char* ScanShortDecimal(
+    const char* p, const char* end, double* value)
+{
+    const bool negative = *p == '-';
+    p += negative;
+    const __m128i text = _mm_loadu_si128(reinterpret_cast<const __m128i*>(p));
+    const __m128i digits = _mm_sub_epi8(text, _mm_set1_epi8('0'));
+    const __m128i isDigit = _mm_cmpeq_epi8(_mm_min_epu8(digits, _mm_set1_epi8(9)), digits);
+    const __m128i isPoint = _mm_cmpeq_epi8(text, _mm_set1_epi8('.'));
+    const auto number = static_cast<uint32_t>(_mm_movemask_epi8(_mm_or_si128(isDigit, isPoint)));
+    // Characters of the number: up to the first other byte, at most sixteen, and none at or
+    // past end (where p may already stand, after a minus at the line's end). A number that
+    // goes on past sixteen is refused below, as what follows them is no blank.
+    const ptrdiff_t length = std::min<ptrdiff_t>(std::countr_zero(~number), end - p);
+    if (length <= 0)
+        return nullptr;
+    const uint32_t points
+        = static_cast<uint32_t>(_mm_movemask_epi8(isPoint)) & ((uint32_t(1) << length) - 1);
+    if ((points & (points - 1)) != 0)
+        return nullptr; // a second point ends the number there
+    const int hasPoint = points != 0;
+    const int point = std::countr_zero(points | 0x10000u); // 16 when there is none
+    const int count = static_cast<int>(length) - hasPoint; // digits
+    if (count == 0)
+        return nullptr;
+    const __m128i places = _mm_setr_epi8(0, 1, 2, 3, 4, 5, 6, 7, 8, 9, 10, 11, 12, 13, 14, 15);
+    const __m128i afterPoint = _mm_cmpgt_epi8(places, _mm_set1_epi8(static_cast<char>(point - 1)));
+    __m128i packed = _mm_or_si128(
+        _mm_and_si128(afterPoint, _mm_srli_si128(digits, 1)), _mm_andnot_si128(afterPoint, digits));
+    packed = _mm_and_si128(packed, _mm_cmpgt_epi8(_mm_set1_epi8(static_cast<char>(count)), places));
+    const __m128i zero = _mm_setzero_si128();
+    const __m128i pairs = _mm_packs_epi32(
+        _mm_madd_epi16(_mm_unpacklo_epi8(packed, zero), _mm_set1_epi32((1 << 16) | 10)),
+        _mm_madd_epi16(_mm_unpackhi_epi8(packed, zero), _mm_set1_epi32((1 << 16) | 10)));
+    const __m128i fours = _mm_madd_epi16(pairs, _mm_set1_epi32((1 << 16) | 100));
+    const __m128i eights
+        = _mm_madd_epi16(_mm_packs_epi32(fours, fours), _mm_set1_epi32((1 << 16) | 10000));
+    const auto high = static_cast<uint32_t>(_mm_cvtsi128_si32(eights));
+    const auto low = static_cast<uint32_t>(_mm_cvtsi128_si32(_mm_srli_si128(eights, 4)));
+    const int zeros = 16 - count;
+    const uint64_t mantissa
+        = ((uint64_t(high) * 100000000 + low) >> zeros) * kInverseFivePowers[zeros];
+    if (mantissa > kMaxExactMantissa)
+        return nullptr;
+    const char* q = p + length;
+    if (q < end && *q != '\0' && !IsCSpace(*q))
+        return nullptr;
+    const int scale = hasPoint ? static_cast<int>(length) - 1 - point : 0;
+    const double magnitude = static_cast<double>(mantissa) / kExactPowersOfTen[scale];
+    *value = std::bit_cast<double>(
+        std::bit_cast<uint64_t>(magnitude) | (static_cast<uint64_t>(negative) << 63));
+    return q;
+}
+#endif
+
+// Where the word at p ends: at the first blank or NUL, or at end. With sixteen bytes loadable,
+// the bytes up to the blank are looked at all at once, and one by one only when a control
+// character comes first.
+[[gnu::always_inline]] inline const char* FindWordEnd(
+    const char* p, const char* end, const char* readable)
+{
+#ifdef __SSE2__
+    if (readable - p >= 16) {
+        const __m128i text = _mm_loadu_si128(reinterpret_cast<const __m128i*>(p));
+        const __m128i low = _mm_cmpeq_epi8(_mm_min_epu8(text, _mm_set1_epi8(' ')), text);
+        const ptrdiff_t first
+            = std::countr_zero(static_cast<uint32_t>(_mm_movemask_epi8(low)) | 0x10000u);
+        if (first >= end - p)
+            return end;
+        if (first < 16 && (p[first] == '\0' || IsCSpace(p[first])))
+            return p + first;
+    }
+#endif
+    while (p < end && *p && !IsCSpace(*p))
+        p++;
+    return p;
+}
+
 } // namespace
 
 const char* ScanPlainDecimal(const char* p, const char* end, double* value)
@@ -191,16 +303,21 @@ int ScanCatalogueData(const char* line, const char* end, const char* readable, c
     while (p < end && IsCSpace(*p))
         p++;
     const char* word = p;
-    while (p < end && *p && !IsCSpace(*p))
-        p++;
-    const char* wordEnd = p;
+    const char* wordEnd = FindWordEnd(word, end, readable);
+    p = wordEnd;
     double values[4];
     bool fast = wordEnd > word;
     for (int i = 0; fast && i < 4; i++) {
         while (p < end && IsCSpace(*p))
             p++;
-        if (const char* after = ScanPlainDecimalWithin(p, end, readable, &values[i]);
-            after && (after == end || IsCSpace(*after))) {
+        const char* after = nullptr;
+#ifdef __SSE2__
+        if (readable - p >= 17)
+            after = ScanShortDecimal(p, end, &values[i]);
+#endif
+        if (!after)
+            after = ScanPlainDecimalWithin(p, end, readable, &values[i]);
+        if (after && (after == end || IsCSpace(*after))) {
             p = after;
         } else {
             if (!LooksDecimal(p, end))
@@ -210,7 +327,11 @@ int ScanCatalogueData(const char* line, const char* end, const char* readable, c
             p = next;
         }
         if (fast && i == 3) {
-            std::memcpy(classText, word, wordEnd - word);
+            // A short class in one step of sixteen bytes: classText holds 501.
+            if (wordEnd - word < 16 && readable - word >= 16)
+                std::memcpy(classText, word, 16);
+            else
+                std::memcpy(classText, word, wordEnd - word);
             classText[wordEnd - word] = '\0';
             *magnitude = values[0];
             *x = values[1];

@@ -41,7 +41,8 @@ const char* ScanPlainDecimal(const char* p, const char* end, double* value);
 // the number of fields read, or -1 for a line with nothing but blanks.
 int ScanCatalogueData(const char* line, const char* end, char* classText, double* magnitude,
     double* x, double* y, double* z);
-// The same, from a buffer that may be loaded up to readable (at or past end): numbers are then
-// read eight characters at a time up to the line's end too. Nothing at or past end counts.
+// The same, from a buffer that may be loaded up to readable (at or past end): the class word
+// and the numbers are then read sixteen characters at a time, or eight, up to the line's end
+// too. Nothing at or past end counts.
 int ScanCatalogueData(const char* line, const char* end, const char* readable, char* classText,
     double* magnitude, double* x, double* y, double* z);

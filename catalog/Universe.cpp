@@ -26,8 +26,9 @@ constexpr size_t kMaxName = 79;
 // line feed).
 constexpr size_t kMaxRecord = 2 * (kMaxLine + 2);
 
-// Bytes past the window the number reader may load (and ignores).
-constexpr size_t kLoadSlack = 8;
+// Bytes past the window the readers of words and numbers may load (and ignore): sixteen
+// characters of a number after its minus.
+constexpr size_t kLoadSlack = 17;
 
 // One line of the catalogue text: where its characters stand, how many were taken, and whether
 // the line went on past them (so that its rest is read as the next line).
@@ -60,8 +61,8 @@ public:
     // Whether a NUL byte has been read: no text holds one.
     bool Binary() const { return fBinary; }
 
-    // How far the buffer may be loaded from, past the text's end: the number reader takes
-    // eight characters at a time and ignores those past a line's end.
+    // How far the buffer may be loaded from, past the text's end: the readers of words and
+    // numbers take sixteen characters at a time and ignore those past a line's end.
     const char* Readable() const { return fBuffer.data() + fBuffer.size(); }
 
     // The next line: its characters up to the line feed, at most kMaxLine of them; the read
@@ -144,15 +145,19 @@ bool ZeroIfNotFinite(double* value)
 // remembered, keyed by their bytes, one per slot.
 class ClassMemo {
 public:
+    // text may be loaded eight bytes from its start, past its NUL.
     const SpectralClass& Parsed(const char* text)
     {
-        const size_t length = strnlen(text, sizeof(uint64_t));
-        if (length == sizeof(uint64_t)) {
+        uint64_t word;
+        std::memcpy(&word, text, sizeof word);
+        // The lowest byte that is zero gets its high bit set here, and no byte below it does.
+        const uint64_t zeros = (word - 0x0101010101010101u) & ~word & 0x8080808080808080u;
+        if (zeros == 0) {
             fLong.SetSpectralClass(text);
             return fLong;
         }
-        uint64_t key = 0;
-        std::memcpy(&key, text, length);
+        // The text's bytes, without what follows its NUL.
+        const uint64_t key = word & ((zeros ^ (zeros - 1)) >> 8);
         Slot& slot = fSlots[(key * 0x9E3779B97F4A7C15u) >> (64 - kSlotBits)];
         if (!slot.used || slot.key != key) {
             slot.parsed.SetSpectralClass(text);

@@ -38,17 +38,36 @@ Fields Ours(const std::string& line)
     return f;
 }
 
-void ExpectSame(const std::string& line)
+// Ours, from a buffer where after follows the line and may be loaded.
+Fields OursFollowedBy(const std::string& line, const std::string& after)
 {
-    const Fields a = Reference(line), b = Ours(line);
+    const std::string buffer = line + after;
+    Fields f {};
+    std::strcpy(f.word, "unset");
+    f.m = f.x = f.y = f.z = -777;
+    f.count = ScanCatalogueData(buffer.data(), buffer.data() + line.size(),
+        buffer.data() + buffer.size(), f.word, &f.m, &f.x, &f.y, &f.z);
+    return f;
+}
+
+// Every field as sscanf gives it, bit for bit.
+void ExpectFields(const Fields& a, const Fields& b, const std::string& line)
+{
     EXPECT_EQ(a.count, b.count) << '"' << line << '"';
     EXPECT_STREQ(a.word, b.word) << '"' << line << '"';
     for (auto [u, v] : { std::pair { a.m, b.m }, { a.x, b.x }, { a.y, b.y }, { a.z, b.z } }) {
-        if (std::isnan(u))
+        if (std::isnan(u)) {
             EXPECT_TRUE(std::isnan(v)) << '"' << line << '"';
-        else
+        } else {
             EXPECT_EQ(u, v) << '"' << line << '"';
+            EXPECT_EQ(std::signbit(u), std::signbit(v)) << '"' << line << '"';
+        }
     }
+}
+
+void ExpectSame(const std::string& line)
+{
+    ExpectFields(Reference(line), Ours(line), line);
 }
 
 } // namespace
@@ -330,12 +349,7 @@ TEST(CNumbers, DigitsPastTheLineThatMayBeLoadedAreNotRead)
         const std::string whole = text;
         const size_t length = random() % (whole.size() + 1);
         const std::string line = whole.substr(0, length);
-        const std::string buffer = line + "123456789012345678";
-        Fields f {};
-        std::strcpy(f.word, "unset");
-        f.m = f.x = f.y = f.z = -777;
-        f.count = ScanCatalogueData(buffer.data(), buffer.data() + length,
-            buffer.data() + buffer.size(), f.word, &f.m, &f.x, &f.y, &f.z);
+        const Fields f = OursFollowedBy(line, "123456789012345678");
         const Fields expected = Reference(line);
         ASSERT_EQ(f.count, expected.count) << '"' << line << '"';
         ASSERT_STREQ(f.word, expected.word) << '"' << line << '"';
@@ -343,5 +357,48 @@ TEST(CNumbers, DigitsPastTheLineThatMayBeLoadedAreNotRead)
         ASSERT_EQ(f.x, expected.x) << '"' << line << '"';
         ASSERT_EQ(f.y, expected.y) << '"' << line << '"';
         ASSERT_EQ(f.z, expected.z) << '"' << line << '"';
+    }
+}
+
+TEST(CNumbers, NumbersOfEveryShapeReadSixteenCharactersAtATimeMatchTheCLibrary)
+{
+    // Numbers of up to twenty digits with the point anywhere or nowhere, leading zeros, signs
+    // and stray points, ended by blanks, NUL, letters or the line's end, after class words of
+    // every length with control characters in them; each line followed in its buffer by more
+    // text the reader may load and must not read.
+    std::mt19937_64 random(2718);
+    const auto pick = [&](const std::string& from) { return from[random() % from.size()]; };
+    const auto number = [&] {
+        std::string text;
+        if (random() % 2 == 0)
+            text += pick("-+-");
+        const size_t digits = random() % 21;
+        const size_t point = random() % (digits + 2); // digits + 1: no point
+        for (size_t i = 0; i < digits; i++) {
+            if (i == point)
+                text += '.';
+            text += random() % 4 == 0 ? '0' : char('0' + random() % 10);
+        }
+        if (point == digits)
+            text += '.';
+        if (random() % 30 == 0)
+            text += pick(".e5x");
+        return text;
+    };
+    for (int i = 0; i < 40000; i++) {
+        std::string line(random() % 20, 'K');
+        for (char& c : line)
+            c = pick("OBAFGKMVI0123456789.\x01\x1f\x7f\xff");
+        for (int field = 0; field < 4; field++)
+            line += std::string(1 + random() % 2, pick("    \t")) + number();
+        line.resize(random() % 8 == 0 ? random() % (line.size() + 1) : line.size());
+        if (!line.empty() && random() % 40 == 0)
+            line[random() % line.size()] = '\0';
+        std::string after(random() % 24, ' ');
+        for (char& c : after)
+            c = pick("0123456789. -e");
+        ExpectFields(Reference(line), OursFollowedBy(line, after), line);
+        if (HasFailure())
+            return;
     }
 }
