@@ -46,9 +46,11 @@ constexpr int kModeCount = 3, kLessThan = 1;
 
 // A list window's drop pads, its handle and its count line (as far as the check box: the line
 // reaches past 100 pixels so that counts of many digits show whole).
+inline const QPoint kPlusPad(16, 16);
 inline const QPoint kEqualsPad(40 + 16, 16);
 inline const QPoint kNotPad(2 + 16, 34 + 8);
 inline const QPoint kAndPad(42 + 16, 34 + 8);
+inline const QPoint kXorPad(122 + 16, 34 + 8);
 inline const QPoint kStarDragger(188 + 16, 10 + 16);
 inline const QRect kCountLine(0, 54, 150, 13);
 
@@ -199,20 +201,35 @@ protected:
     // one not in `known`; 0 when none came.
     static unsigned long Open(int item, const char* title, const QList<unsigned long>& known = {})
     {
-        RunXdotool(ClickAt(ControlCentre(item)));
-        unsigned long opened = 0;
+        return OpenAt(ControlCentre(item), title, known);
+    }
+
+    // Clicks the screen at `click` and returns the window titled `title` that it opened, one not
+    // in `known`; 0 when none came.
+    static unsigned long OpenAt(
+        QPoint click, const char* title, const QList<unsigned long>& known = {})
+    {
+        RunXdotool(ClickAt(click));
+        return ShownWindow(title, known);
+    }
+
+    // Waits for a window titled `title`, not one in `known`, to be shown with an inside; 0 when
+    // none came.
+    static unsigned long ShownWindow(const char* title, const QList<unsigned long>& known = {})
+    {
+        unsigned long shown = 0;
         (void)QTest::qWaitFor(
             [&] {
                 for (unsigned long window : WindowsNamed(title)) {
                     if (!known.contains(window) && !ClientArea(window).isEmpty()) {
-                        opened = window;
+                        shown = window;
                         return true;
                     }
                 }
                 return false;
             },
             10000);
-        return opened;
+        return shown;
     }
 
     // Moves window to `place` and returns where its inside then stands, once it has left where
