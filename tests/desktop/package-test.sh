@@ -14,6 +14,14 @@ fail() {
     status=1
 }
 
+# What makes and checks the package (scripts/setup installs them).
+for tool in cpack dpkg-deb dpkg-shlibdeps lintian objcopy objdump readelf; do
+    command -v "$tool" >/dev/null || {
+        echo "FAIL: $tool is not installed (scripts/setup installs it)" >&2
+        exit 1
+    }
+done
+
 rm -rf "$work"
 mkdir -p "$work"
 if ! cpack --config "$build/CPackConfig.cmake" -B "$work" >"$work/cpack.log" 2>&1; then
