@@ -4,8 +4,8 @@
 //
 // Lines it reads: "open <n>" clicks the n-th button of the control window (0 a new chart, 1 the
 // star information, 2 the H-R diagram, 3 the find window, 4 a star list); "close" closes the
-// control window the way a compositor's close does (through the window system's close event);
-// "maximize" maximises a chart.
+// control window with QWindow::close(), the call Qt's Wayland platform makes when the compositor
+// sends xdg_toplevel.close; "maximize" maximises a chart.
 // Lines it writes: "opened <title>" once the window a click opened is shown by the compositor
 // and its own picture is saved as <title>.png in the working folder; "not opened" when none
 // came within ten seconds; "maximized" or "not maximized".
