@@ -505,6 +505,26 @@ TEST_F(UniverseTest, AWellMadeCatalogueReportsNothing)
     EXPECT_EQ(report, CatalogueReport());
 }
 
+TEST_F(UniverseTest, ManySystemsFollowThoseAlreadyThereInFileOrderAndNothingElse)
+{
+    // More systems than the reader makes room for at once, several times over and not a
+    // multiple of it, after systems another reading left: each in its place, no empty one.
+    Universe u(5000);
+    ReadText(GoodRecords(0, 3), &u);
+    ReadText(GoodRecords(3, 10000), &u);
+    ASSERT_EQ(u.CountItems(), 10003);
+    for (int32_t i = 0; i < u.CountItems(); i++) {
+        ASSERT_NE(u.SystemAt(i), nullptr) << i;
+        ASSERT_EQ(u.SystemAt(i)->position.x, i) << i;
+        ASSERT_EQ(u.SystemAt(i)->CountItems(), 1) << i;
+    }
+
+    // A NUL after those runs takes out what this reading added, and only that.
+    ReadText(GoodRecords(10003, 9000) + std::string(1, '\0'), &u, 4096);
+    EXPECT_EQ(u.CountItems(), 10003);
+    EXPECT_EQ(u.SystemAt(10002)->position.x, 10002);
+}
+
 TEST_F(UniverseTest, AFileHoldingNulBytesIsNoCatalogue)
 {
     // A program's first bytes: without the refusal its first system would be named "\x7f" "ELF".
