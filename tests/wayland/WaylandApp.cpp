@@ -5,7 +5,7 @@
 // Lines it reads: "open <n>" clicks the n-th button of the control window (0 a new chart, 1 the
 // star information, 2 the H-R diagram, 3 the find window, 4 a star list); "close" closes the
 // control window with QWindow::close(), the call Qt's Wayland platform makes when the compositor
-// sends xdg_toplevel.close; "maximize" maximises a chart.
+// sends xdg_toplevel.close; "maximize" maximises a chart; "help" opens the help window (F1).
 // Lines it writes: "opened <title>" once the window a click opened is shown by the compositor
 // and its own picture is saved as <title>.png in the working folder; "not opened" when none
 // came within ten seconds; "maximized" or "not maximized".
@@ -13,6 +13,7 @@
 #include "controls/ControlWindow.h"
 
 #include <QApplication>
+#include <QShortcut>
 #include <QSocketNotifier>
 #include <QTest>
 #include <QWidget>
@@ -51,6 +52,16 @@ void Click(ControlWindow* controls, int n)
     if (n >= 0 && n < int(std::size(kButtonNames))) {
         if (QWidget* button = controls->findChild<QWidget*>(kButtonNames[n]))
             QTest::mouseClick(button, Qt::LeftButton, Qt::NoModifier, QPoint(16, 16));
+    }
+}
+
+// Presses F1 as far as the program can tell: a compositor without a keyboard gives no window
+// the focus that key events need, so the shortcut is set off directly.
+void PressF1(ControlWindow* controls)
+{
+    for (QShortcut* shortcut : controls->findChildren<QShortcut*>()) {
+        if (shortcut->key() == QKeySequence(Qt::Key_F1))
+            emit shortcut->activated();
     }
 }
 
@@ -118,6 +129,8 @@ int main(int argc, char** argv)
             Open([&] { Click(controls, n); });
         else if (QByteArray(line).startsWith("maximize"))
             Maximize();
+        else if (QByteArray(line).startsWith("help"))
+            Open([&] { PressF1(controls); });
         else if (QByteArray(line).startsWith("close") && controls)
             controls->windowHandle()->close();
     });
