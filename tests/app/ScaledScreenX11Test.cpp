@@ -10,12 +10,9 @@
 // X server (window areas, xwd dumps) and what goes to xdotool is in the screen's own pixels.
 #include "LabelReader.h"
 #include "ProgramX11Support.h"
+#include "ScaledPixels.h"
 
-#include "render/SystemPalette.h"
-
-#include <QPalette>
 #include <QScreen>
-#include <QSet>
 #include <algorithm>
 #include <cmath>
 #include <optional>
@@ -91,61 +88,6 @@ void ExpectOnTheScreen(const char* name, unsigned long window)
     EXPECT_TRUE(QRect(QPoint(0, 0), kFullHD).contains(frame))
         << "the " << name << " window's frame stands at " << frame.x() << ", " << frame.y()
         << " and is " << frame.width() << " x " << frame.height() << " pixels";
-}
-
-// The colours of the system palette as the screen shows them.
-QSet<QRgb> PaletteColours()
-{
-    QSet<QRgb> colours;
-    for (int i = 0; i < 255; i++) {
-        const rgb_color& c = system_colors()->color_list[i];
-        colours.insert(qRgb(c.red, c.green, c.blue));
-    }
-    return colours;
-}
-
-// How many blocks of 2 x 2 pixels of image, from its top-left, are not all of one colour.
-int MixedBlocks(const QImage& image)
-{
-    int mixed = 0;
-    for (int y = 0; y + 1 < image.height(); y += 2) {
-        for (int x = 0; x + 1 < image.width(); x += 2) {
-            const QRgb p = image.pixel(x, y);
-            mixed += image.pixel(x + 1, y) != p || image.pixel(x, y + 1) != p
-                || image.pixel(x + 1, y + 1) != p;
-        }
-    }
-    return mixed;
-}
-
-// How many pixels of image are of a colour neither the palette nor the windows' backgrounds (the
-// views' grey, the toolkit's window colour, seen where a picture is transparent) have: blends.
-int BlendedPixels(const QImage& image)
-{
-    static const QSet<QRgb> shown = [] {
-        QSet<QRgb> colours = PaletteColours();
-        colours.insert(qRgb(220, 220, 220));
-        colours.insert(QGuiApplication::palette().color(QPalette::Window).rgb());
-        return colours;
-    }();
-    int blended = 0;
-    for (int y = 0; y < image.height(); y++) {
-        for (int x = 0; x < image.width(); x++)
-            blended += !shown.contains(image.pixel(x, y) | 0xff000000u);
-    }
-    return blended;
-}
-
-// Whether picture shows more than one colour: something has been drawn.
-bool Drawn(const QImage& picture)
-{
-    for (int y = 0; y < picture.height(); y++) {
-        for (int x = 0; x < picture.width(); x++) {
-            if (picture.pixel(x, y) != picture.pixel(0, 0))
-                return true;
-        }
-    }
-    return false;
 }
 
 // Expects `area` of window's inside, an 8-bit view, to be shown without blur: at a whole scale

@@ -1,30 +1,20 @@
 // The help window on a small screen at a large scale factor: it stays inside the screen's free
 // area and its page scrolls down to the last line.
 #include "ControlsOnTwoStars.h"
+#include "ScaledRun.h"
 
 #include "controls/HelpWindow.h"
 
 #include <QApplication>
-#include <QFile>
 #include <QLabel>
-#include <QProcess>
 #include <QScreen>
 #include <QScrollArea>
 #include <QScrollBar>
-#include <QTemporaryDir>
 #include <QTest>
 #include <QWheelEvent>
 #include <gtest/gtest.h>
 
 namespace {
-
-// Set in the copy of this program that runs the checks at scale 2.
-constexpr char kScaledRun[] = "ND_HELP_WINDOW_SCALED_RUN";
-
-// A full-HD screen at twice the size: 960 by 540 in the program's own pixels.
-constexpr char kScreenConfig[]
-    = R"({ "screens": [ { "name": "FullHD", "x": 0, "y": 0, "width": 1920, "height": 1080,
-           "logicalDpi": 96, "logicalBaseDpi": 96, "dpr": 1 } ] })";
 
 QWidget* ShownHelpWindow()
 {
@@ -118,33 +108,8 @@ void CheckHelpWindowOnTheScaledScreen()
 
 TEST(HelpWindowTest, AtScaleTwoOnAFullHDScreenFitsAndScrollsToItsLastLine)
 {
-    if (qEnvironmentVariableIsSet(kScaledRun)) {
+    if (InScaledRun())
         CheckHelpWindowOnTheScaledScreen();
-        return;
-    }
-    // The scale factor is read when the application starts: this test runs again in a copy of
-    // this program started at scale 2 on a screen of 1920 by 1080 pixels.
-    QTemporaryDir folder;
-    ASSERT_TRUE(folder.isValid());
-    QFile config(folder.filePath("screen.json"));
-    ASSERT_TRUE(config.open(QIODevice::WriteOnly));
-    config.write(kScreenConfig);
-    config.close();
-
-    QProcessEnvironment environment = QProcessEnvironment::systemEnvironment();
-    environment.insert(kScaledRun, "1");
-    environment.insert("QT_SCALE_FACTOR", "2");
-    environment.insert("QT_QPA_PLATFORM", "offscreen:configfile=" + config.fileName());
-    environment.remove("DISPLAY");
-    QProcess copy;
-    copy.setProcessEnvironment(environment);
-    copy.setProcessChannelMode(QProcess::MergedChannels);
-    copy.start(QCoreApplication::applicationFilePath(),
-        { "--gtest_filter=HelpWindowTest.AtScaleTwoOnAFullHDScreenFitsAndScrollsToItsLastLine" });
-    ASSERT_TRUE(copy.waitForFinished(120000));
-    const QString output = QString::fromLocal8Bit(copy.readAll());
-    EXPECT_EQ(copy.exitStatus(), QProcess::NormalExit) << output.toStdString();
-    EXPECT_EQ(copy.exitCode(), 0) << output.toStdString();
-    // The copy ran the test rather than finding nothing to run.
-    EXPECT_TRUE(output.contains("[  PASSED  ] 1 test")) << output.toStdString();
+    else
+        RunScaled("HelpWindowTest.AtScaleTwoOnAFullHDScreenFitsAndScrollsToItsLastLine", 2);
 }
