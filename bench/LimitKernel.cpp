@@ -83,25 +83,27 @@ int64_t LimitKernel(const UniverseView::StarPassData& data, const SMatrix& trans
     const double f = focalLength, right = frame.right, bottom = frame.bottom;
     const double cx = right * 0.5, cy = bottom * 0.5;
     const double reachX = (cx + 1) / f, reachY = (cy + 1) / f;
+    const ExactCamera exact { m[0][0], m[0][1], m[0][2], m[0][3], m[1][0], m[1][1], m[1][2],
+        m[1][3], m[2][0], m[2][1], m[2][2], m[2][3], f, cx, cy };
     int64_t visible = 0;
     for (int32_t first = 0; first < data.count; first += kChunk) {
         const int32_t n = std::min(kChunk, data.count - first);
         uint64_t words[kChunk / 64] = {};
         FlagWords(data, transform, reachX, reachY, first, n, words);
         // The few flagged are projected and, when on screen, add one to their pixel.
+        int32_t index[kChunk];
+        int32_t flagged = 0;
         for (int32_t w = 0; w < (n + 63) / 64; w++) {
-            for (uint64_t bits = words[w]; bits != 0; bits &= bits - 1) {
-                const int32_t i = first + w * 64 + std::countr_zero(bits);
-                const double x = data.x[i], y = data.y[i], z = data.z[i];
-                const double tx = m[0][0] * x + m[0][1] * y + m[0][2] * z + m[0][3];
-                const double ty = m[1][0] * x + m[1][1] * y + m[1][2] * z + m[1][3];
-                const double tz = m[2][0] * x + m[2][1] * y + m[2][2] * z + m[2][3];
-                double sx, sy;
-                ExactScreenPoint(tx, ty, tz, f, cx, cy, &sx, &sy);
-                if (tz > 0 && sx >= 1 && sx < right && sy >= 1 && sy < bottom) {
-                    pixels[int32_t(sy) * pitch + int32_t(sx)]++;
-                    visible++;
-                }
+            for (uint64_t bits = words[w]; bits != 0; bits &= bits - 1)
+                index[flagged++] = first + w * 64 + std::countr_zero(bits);
+        }
+        double sxs[kChunk], sys[kChunk], zs[kChunk];
+        ExactPoints(data.x, data.y, data.z, index, flagged, exact, sxs, sys, zs);
+        for (int32_t k = 0; k < flagged; k++) {
+            const double sx = sxs[k], sy = sys[k];
+            if (zs[k] > 0 && sx >= 1 && sx < right && sy >= 1 && sy < bottom) {
+                pixels[int32_t(sy) * pitch + int32_t(sx)]++;
+                visible++;
             }
         }
     }

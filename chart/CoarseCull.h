@@ -12,6 +12,7 @@
 #if defined(__x86_64__) && defined(__GNUC__)
 #include <immintrin.h>
 #define ND_COARSE_CULL_AVX2 1
+
 #endif
 
 // The rows of the transform that the test needs, and how far from the view axis, in units of
@@ -32,6 +33,24 @@ inline void ExactScreenPoint(
     const Pair quotients = Pair { tx * f, -ty * f } / Pair { z, z };
     *sx = quotients[0] + cx;
     *sy = quotients[1] + cy;
+}
+
+// What the exact projection needs: the transform's rows, the focal length and the frame's
+// middle.
+struct ExactCamera {
+    double m00, m01, m02, m03, m10, m11, m12, m13, m20, m21, m22, m23;
+    double f, cx, cy;
+};
+
+// The screen point and depth of system (x, y, z) by the rule, the transform as
+// SMatrix::Transform does it: every operation rounded as the rule rounds it.
+inline void ExactPoint(
+    double x, double y, double zw, const ExactCamera& c, double* sx, double* sy, double* z)
+{
+    const double tx = c.m00 * x + c.m01 * y + c.m02 * zw + c.m03;
+    const double ty = c.m10 * x + c.m11 * y + c.m12 * zw + c.m13;
+    *z = c.m20 * x + c.m21 * y + c.m22 * zw + c.m23;
+    ExactScreenPoint(tx, ty, *z, c.f, c.cx, c.cy, sx, sy);
 }
 
 #ifdef ND_COARSE_CULL_AVX2
@@ -85,4 +104,59 @@ __attribute__((target("avx2,fma"))) inline void CoarseCullAvx2(const double* px,
     }
 }
 
+// One row of the transform applied to four points, in SMatrix::Transform's order.
+__attribute__((target("avx2"))) inline __m256d TransformRow(
+    double a, double b, double d, double e, __m256d x, __m256d y, __m256d w)
+{
+    const __m256d xy
+        = _mm256_add_pd(_mm256_mul_pd(_mm256_set1_pd(a), x), _mm256_mul_pd(_mm256_set1_pd(b), y));
+    return _mm256_add_pd(_mm256_add_pd(xy, _mm256_mul_pd(_mm256_set1_pd(d), w)), _mm256_set1_pd(e));
+}
+
+// ExactPoint for count systems, four at a time: system k is at index[k] of the arrays. Vector
+// operations round each lane as the operation of one does, and nothing is fused (the caller
+// is built so), so every point is the rule's to the last bit.
+__attribute__((target("avx2"))) inline void ExactPointsAvx2(const double* px, const double* py,
+    const double* pz, const int32_t* index, int32_t count, const ExactCamera& c, double* sx,
+    double* sy, double* z)
+{
+    int32_t k = 0;
+    for (; k + 4 <= count; k += 4) {
+        const __m128i at = _mm_loadu_si128(reinterpret_cast<const __m128i*>(index + k));
+        // The masked form with every lane on: the plain one starts from an undefined vector.
+        const __m256d none = _mm256_setzero_pd();
+        const __m256d every = _mm256_castsi256_pd(_mm256_set1_epi64x(-1));
+        const __m256d x = _mm256_mask_i32gather_pd(none, px, at, every, 8);
+        const __m256d y = _mm256_mask_i32gather_pd(none, py, at, every, 8);
+        const __m256d w = _mm256_mask_i32gather_pd(none, pz, at, every, 8);
+        const __m256d tx = TransformRow(c.m00, c.m01, c.m02, c.m03, x, y, w);
+        const __m256d ty = TransformRow(c.m10, c.m11, c.m12, c.m13, x, y, w);
+        const __m256d tz = TransformRow(c.m20, c.m21, c.m22, c.m23, x, y, w);
+        const __m256d f = _mm256_set1_pd(c.f);
+        const __m256d qx = _mm256_div_pd(_mm256_mul_pd(tx, f), tz);
+        const __m256d qy
+            = _mm256_div_pd(_mm256_mul_pd(_mm256_xor_pd(ty, _mm256_set1_pd(-0.0)), f), tz);
+        _mm256_storeu_pd(sx + k, _mm256_add_pd(qx, _mm256_set1_pd(c.cx)));
+        _mm256_storeu_pd(sy + k, _mm256_add_pd(qy, _mm256_set1_pd(c.cy)));
+        _mm256_storeu_pd(z + k, tz);
+    }
+    for (; k < count; k++)
+        ExactPoint(px[index[k]], py[index[k]], pz[index[k]], c, sx + k, sy + k, z + k);
+}
+
 #endif
+
+// ExactPoint for count systems, system k at index[k] of the arrays: four at a time where the
+// processor can.
+inline void ExactPoints(const double* px, const double* py, const double* pz, const int32_t* index,
+    int32_t count, const ExactCamera& c, double* sx, double* sy, double* z)
+{
+#ifdef ND_COARSE_CULL_AVX2
+    if (CoarseCullHasAvx2()) {
+        ExactPointsAvx2(px, py, pz, index, count, c, sx, sy, z);
+        return;
+    }
+#endif
+    for (int32_t k = 0; k < count; k++)
+        ExactPoint(px[index[k]], py[index[k]], pz[index[k]], c, sx + k, sy + k, z + k);
+}

@@ -258,17 +258,20 @@ void UniverseView::RenderSpan(RBitmap8* target, int32_t begin, int32_t end, int3
         }
         queued = 0;
     };
+    const ExactCamera exact { camera.m00, camera.m01, camera.m02, camera.m03, camera.m10,
+        camera.m11, camera.m12, camera.m13, camera.m20, camera.m21, camera.m22, camera.m23,
+        camera.f, camera.cx, camera.cy };
     const auto drawChunk = [&](int32_t first, const int32_t* places, int32_t flagged) {
+        // The rule's own arithmetic, rounded as it rounds (this file fuses nothing): the
+        // transform as SMatrix::Transform does it, then sx = trunc(x f / z + right / 2).
+        int32_t index[kChunk];
+        double sxs[kChunk], sys[kChunk], zs[kChunk];
+        for (int32_t v = 0; v < flagged; v++)
+            index[v] = first + places[v] * step;
+        ExactPoints(px, py, pz, index, flagged, exact, sxs, sys, zs);
         for (int32_t v = 0; v < flagged; v++) {
-            // The rule's own arithmetic, rounded as it rounds (this file fuses nothing): the
-            // transform as SMatrix::Transform does it, then sx = trunc(x f / z + right / 2).
-            const int32_t i = first + places[v] * step;
-            const double x = px[i], y = py[i], zw = pz[i];
-            const double tx = camera.m00 * x + camera.m01 * y + camera.m02 * zw + camera.m03;
-            const double ty = camera.m10 * x + camera.m11 * y + camera.m12 * zw + camera.m13;
-            const double z = camera.m20 * x + camera.m21 * y + camera.m22 * zw + camera.m23;
-            double sxf, syf;
-            ExactScreenPoint(tx, ty, z, camera.f, camera.cx, camera.cy, &sxf, &syf);
+            const int32_t i = index[v];
+            const double sxf = sxs[v], syf = sys[v], z = zs[v];
             if (!(z > 0 && sxf >= 1 && sxf < camera.right && syf >= 1 && syf < camera.bottom))
                 continue;
             const ColorTable* table = TableOf(i);
