@@ -7,9 +7,12 @@
 
 #include <QDragEnterEvent>
 #include <QDropEvent>
+#include <QGuiApplication>
 #include <QProcess>
+#include <QScreen>
 #include <QStringList>
 #include <QWidget>
+#include <cmath>
 #include <gtest/gtest.h>
 #include <optional>
 
@@ -44,13 +47,36 @@ protected:
     }
 };
 
+// xdotool's arguments with each pointer position (the two numbers after "mousemove") taken from
+// this process's pixels to the screen's: they differ at a scale factor (QT_SCALE_FACTOR), and
+// positions worked out from widgets are in this process's pixels. The top-left pixel of the
+// screen's that show a pixel of this process's is taken.
+inline QStringList InScreenPixels(QStringList arguments)
+{
+    const QScreen* screen = qGuiApp ? QGuiApplication::primaryScreen() : nullptr;
+    const double scale = screen ? screen->devicePixelRatio() : 1.0;
+    if (scale == 1.0)
+        return arguments;
+    for (qsizetype i = 0; i + 2 < arguments.size(); i++) {
+        if (arguments[i] != "mousemove")
+            continue;
+        bool isX = false, isY = false;
+        const double x = arguments[i + 1].toDouble(&isX), y = arguments[i + 2].toDouble(&isY);
+        if (isX && isY) {
+            arguments[i + 1] = QString::number(int(std::floor(x * scale)));
+            arguments[i + 2] = QString::number(int(std::floor(y * scale)));
+        }
+    }
+    return arguments;
+}
+
 // Runs xdotool with the given commands without blocking the event loop: a drag runs a nested
-// loop of its own while the pointer moves.
+// loop of its own while the pointer moves. Pointer positions are in this process's pixels.
 class Xdotool {
 public:
     void Run(const QStringList& arguments)
     {
-        fProcess.start("xdotool", arguments);
+        fProcess.start("xdotool", InScreenPixels(arguments));
         ASSERT_TRUE(fProcess.waitForStarted(5000)) << "xdotool is not installed";
     }
     bool Finished() const { return fProcess.state() == QProcess::NotRunning; }

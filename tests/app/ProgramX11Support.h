@@ -54,11 +54,12 @@ inline const QPoint kXorPad(122 + 16, 34 + 8);
 inline const QPoint kStarDragger(188 + 16, 10 + 16);
 inline const QRect kCountLine(0, 54, 150, 13);
 
-// Runs xdotool to its end (no drag of ours runs meanwhile) and returns what it printed.
+// Runs xdotool to its end (no drag of ours runs meanwhile) and returns what it printed. Pointer
+// positions are in this process's pixels; windows are moved in the screen's.
 inline QString RunXdotool(const QStringList& arguments)
 {
     QProcess process;
-    process.start("xdotool", arguments);
+    process.start("xdotool", InScreenPixels(arguments));
     process.waitForFinished(20000);
     return QString::fromUtf8(process.readAllStandardOutput()).trimmed();
 }

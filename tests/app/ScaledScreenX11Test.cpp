@@ -7,7 +7,8 @@
 //
 // This process runs at the program's scale, so its widgets and its grabs of the screen (Grab,
 // LabelReader) are in the same device-independent pixels as the program's; what comes from the
-// X server (window areas, xwd dumps) and what goes to xdotool is in the screen's own pixels.
+// X server (window areas, xwd dumps) and the places windows are moved to are in the screen's own
+// pixels. Pointer positions given to xdotool are in this process's pixels (InScreenPixels).
 #include "LabelReader.h"
 #include "ProgramX11Support.h"
 #include "ScaledPixels.h"
@@ -59,7 +60,8 @@ protected:
 
     // The scale factor the program and this test run at.
     static double Scale() { return QGuiApplication::primaryScreen()->devicePixelRatio(); }
-    // A point of the program's pixels as a pixel of the screen, for xdotool.
+    // A point of the program's pixels as a pixel of the screen, for moving windows and for
+    // pictures of the screen.
     static QPoint Device(QPointF logical)
     {
         return QPoint(
@@ -76,7 +78,7 @@ protected:
     static unsigned long OpenScaled(unsigned long controls, int item, const char* title)
     {
         const QPoint inside = Inside(controls);
-        return OpenAt(Device(inside + kControlItems + QPointF(32 * item + 16, 16)), title);
+        return OpenAt(inside + kControlItems + QPoint(32 * item + 16, 16), title);
     }
 };
 
@@ -233,7 +235,7 @@ TEST_P(ScaledScreen, AHoverNamesTheStarAndDropsLandOnThePads)
     const LabelReader strip(kChartStrip, { "", kSunHovered, kSunSelected });
     // Brought in from the left in small steps, as a hand moves it.
     for (int step = 8; step >= 0; step--) {
-        const QPoint at = Device(middle - QPointF(step * 4, 0));
+        const QPoint at = (middle - QPointF(step * 4, 0)).toPoint();
         RunXdotool({ "mousemove", Number(at.x()), Number(at.y()), "sleep", "0.05" });
     }
     EXPECT_EQ(strip.WaitFor(chartInside, 1), 1)
@@ -246,7 +248,7 @@ TEST_P(ScaledScreen, AHoverNamesTheStarAndDropsLandOnThePads)
         << strip.Difference(chartInside, 2) << " of its pixels differ)";
 
     // The Sun onto Plus.
-    Drag(Device(middle), Device(listInside + QPointF(kPlusPad)));
+    Drag(middle.toPoint(), listInside + kPlusPad);
     EXPECT_EQ(countLine.WaitFor(listInside, 1), 1)
         << "the list does not hold the Sun (" << countLine.Difference(listInside, 1)
         << " pixels of its count line differ)";
@@ -261,7 +263,7 @@ TEST_P(ScaledScreen, AHoverNamesTheStarAndDropsLandOnThePads)
             empty = QPoint(x, 20);
     }
     ASSERT_TRUE(empty) << "no empty space along the top of the chart";
-    Drag(Device(chartInside + *empty), Device(listInside + QPointF(kXorPad)));
+    Drag(chartInside + *empty, listInside + kXorPad);
     const int others = int(catalogue.size()) - 1;
     EXPECT_EQ(countLine.WaitFor(listInside, others), others)
         << "the list does not hold every system but the Sun ("

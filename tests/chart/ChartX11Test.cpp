@@ -24,10 +24,15 @@ QImage OnScreen(const QWidget* widget)
         .convertToFormat(QImage::Format_RGB32);
 }
 
-// A view's last finished frame in the colours the screen shows.
+// A view's last finished frame in the colours and the pixels the screen shows: at a whole scale
+// factor each of its pixels a block of scale x scale identical pixels.
 QImage Shown(UniverseView* view)
 {
-    return view->FrontImage().convertToFormat(QImage::Format_RGB32);
+    const QImage frame = view->FrontImage().convertToFormat(QImage::Format_RGB32);
+    const int scale = int(view->devicePixelRatio());
+    return scale == 1
+        ? frame
+        : frame.scaled(frame.size() * scale, Qt::IgnoreAspectRatio, Qt::FastTransformation);
 }
 
 int LitPixels(const QImage& image)

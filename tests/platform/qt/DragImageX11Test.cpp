@@ -19,6 +19,7 @@
 #include <QScreen>
 #include <QTest>
 #include <QTimer>
+#include <cmath>
 #include <functional>
 #include <optional>
 
@@ -39,8 +40,10 @@ QImage Grab(QRect area)
         .convertToFormat(QImage::Format_RGB32);
 }
 
-// How a grab of the drag picture differs from the picture: coloured pixels must show their
-// palette colour, transparent ones what lies beneath the picture or black (as xwd shows them).
+// How a grab of the drag picture, in the screen's pixels, differs from the picture: coloured pixels
+// must show their palette colour, transparent ones what lies beneath the picture or black (as xwd
+// shows them). At a whole scale factor each pixel of the picture is a block of scale x scale
+// pixels of the screen, every one of which must show it.
 struct Difference {
     int wrongColoured = 0;
     int wrongTransparent = 0;
@@ -49,14 +52,14 @@ struct Difference {
     bool Empty() const { return wrongColoured == 0 && wrongTransparent == 0; }
 };
 
-Difference Compare(const RBitmap8& picture, const QImage& shown)
+Difference Compare(const RBitmap8& picture, const QImage& shown, int scale)
 {
     Difference difference;
     const QList<QRgb>& palette = SystemColorTable();
     const uint8_t* bits = picture.Bits();
-    for (int y = 0; y < kSide; y++) {
-        for (int x = 0; x < kSide; x++) {
-            const uint8_t index = bits[y * picture.BytesPerRow() + x];
+    for (int y = 0; y < kSide * scale; y++) {
+        for (int x = 0; x < kSide * scale; x++) {
+            const uint8_t index = bits[y / scale * picture.BytesPerRow() + x / scale];
             const QRgb pixel = shown.pixel(x, y) | 0xff000000;
             bool right;
             if (index == 255) {
@@ -117,6 +120,9 @@ protected:
     {
         if (QGuiApplication::platformName() != "xcb")
             GTEST_SKIP() << "needs an X server: run under scripts/with-xvfb";
+        const double scale = QGuiApplication::primaryScreen()->devicePixelRatio();
+        if (scale != std::floor(scale))
+            GTEST_SKIP() << "the picture is compared pixel by pixel at whole scale factors only";
         InitResources();
     }
 
@@ -144,6 +150,9 @@ protected:
         const QPoint from = source.mapToGlobal(QPoint(20, 100));
         const QPoint to = source.mapToGlobal(QPoint(150, 90));
         const QRect where(to - kHotSpot, QSize(kSide, kSide));
+        // The screen's pixels under it, at the scale factor this test runs at.
+        const int scale = int(QGuiApplication::primaryScreen()->devicePixelRatio());
+        const QRect whereOnScreen(where.topLeft() * scale, where.size() * scale);
         Xdotool hand, release;
         Difference onScreen;
         // xwd is slow: its dump is read once the screen is right, or when time is up.
@@ -153,10 +162,10 @@ protected:
             if (!hand.Finished())
                 return false;
             const bool last = deadline.hasExpired();
-            onScreen = Compare(picture, Grab(where));
+            onScreen = Compare(picture, Grab(where), scale);
             if (!onScreen.Empty() && !last)
                 return false;
-            inDump = Compare(picture, XwdRootImage().copy(where));
+            inDump = Compare(picture, XwdRootImage().copy(whereOnScreen), scale);
             if (!inDump->Empty() && !last)
                 return false;
             release.Run({ "mouseup", "1" });
