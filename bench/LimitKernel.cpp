@@ -39,6 +39,11 @@ ND_VECTOR_CLONES __attribute__((optimize("fp-contract=fast"))) void Flag(const d
 // Shown: the draw mask's byte is not 0.
 struct Shown {
     const uint8_t* shown;
+    __attribute__((target("avx2"))) void Ahead(int32_t j) const
+    {
+        if (j % 64 == 0)
+            PrefetchStream(shown + j);
+    }
     __attribute__((target("avx2,fma"))) __m256d operator()(int32_t j, __m256d) const
     {
         uint32_t four;
@@ -90,22 +95,38 @@ int64_t LimitKernel(const UniverseView::StarPassData& data, const SMatrix& trans
         const int32_t n = std::min(kChunk, data.count - first);
         uint64_t words[kChunk / 64] = {};
         FlagWords(data, transform, reachX, reachY, first, n, words);
-        // The few flagged are projected and, when on screen, add one to their pixel.
-        int32_t index[kChunk];
-        int32_t flagged = 0;
-        for (int32_t w = 0; w < (n + 63) / 64; w++) {
-            for (uint64_t bits = words[w]; bits != 0; bits &= bits - 1)
-                index[flagged++] = first + w * 64 + std::countr_zero(bits);
-        }
-        double sxs[kChunk], sys[kChunk], zs[kChunk];
-        ExactPoints(data.x, data.y, data.z, index, flagged, exact, sxs, sys, zs);
-        for (int32_t k = 0; k < flagged; k++) {
-            const double sx = sxs[k], sy = sys[k];
-            if (zs[k] > 0 && sx >= 1 && sx < right && sy >= 1 && sy < bottom) {
+        // The flagged are projected and, when on screen, add one to their pixel: one by one
+        // where few are (the usual view), four at a time where many are.
+        const auto add = [&](double sx, double sy, double z) {
+            if (z > 0 && sx >= 1 && sx < right && sy >= 1 && sy < bottom) {
                 pixels[int32_t(sy) * pitch + int32_t(sx)]++;
                 visible++;
             }
+        };
+        int32_t flagged = 0;
+        for (int32_t w = 0; w < (n + 63) / 64; w++)
+            flagged += std::popcount(words[w]);
+        if (flagged < kChunk / 8) {
+            for (int32_t w = 0; w < (n + 63) / 64; w++) {
+                for (uint64_t bits = words[w]; bits != 0; bits &= bits - 1) {
+                    const int32_t i = first + w * 64 + std::countr_zero(bits);
+                    double sx, sy, z;
+                    ExactPoint(data.x[i], data.y[i], data.z[i], exact, &sx, &sy, &z);
+                    add(sx, sy, z);
+                }
+            }
+            continue;
         }
+        int32_t index[kChunk];
+        int32_t k = 0;
+        for (int32_t w = 0; w < (n + 63) / 64; w++) {
+            for (uint64_t bits = words[w]; bits != 0; bits &= bits - 1)
+                index[k++] = first + w * 64 + std::countr_zero(bits);
+        }
+        double sxs[kChunk], sys[kChunk], zs[kChunk];
+        ExactPoints(data.x, data.y, data.z, index, flagged, exact, sxs, sys, zs);
+        for (k = 0; k < flagged; k++)
+            add(sxs[k], sys[k], zs[k]);
     }
     return visible;
 }

@@ -124,6 +124,11 @@ int32_t Flagged(const uint64_t* words, int32_t n, int32_t* places)
 struct ShownAndBright {
     const float* lum;
     bool everyOne;
+    __attribute__((target("avx2"))) void Ahead(int32_t j) const
+    {
+        if (j % 16 == 0)
+            PrefetchStream(lum + j);
+    }
     __attribute__((target("avx2,fma"))) __m256d operator()(int32_t j, __m256d tz) const
     {
         const __m256d l = _mm256_cvtps_pd(_mm_loadu_ps(lum + j));
