@@ -1,4 +1,5 @@
 // The frame's model steps: brightness cache, camera, star pass, overlay and the distance filter.
+#include "chart/StarBrightness.h"
 #include "chart/UniverseView.h"
 
 #include "core/CCoord.h"
@@ -9,7 +10,6 @@
 #include <algorithm>
 #include <cmath>
 #include <cstdio>
-#include <limits>
 #include <string>
 
 namespace {
@@ -60,14 +60,7 @@ void UniverseView::RebuildPassLum()
     fPassLum.resize(count);
     for (size_t i = 0; i < count; i++) {
         const double lum = lumCache[i];
-        float pass = kPassDark;
-        if (lum > double(std::numeric_limits<float>::max()))
-            pass = std::numeric_limits<float>::infinity();
-        else if (lum >= 0) {
-            pass = float(lum);
-            if (double(pass) < lum)
-                pass = std::nextafter(pass, std::numeric_limits<float>::infinity());
-        }
+        const float pass = lum >= 0 ? RoundedUpToFloat(lum) : kPassDark;
         fPassLum[i] = drawMask->states[i] ? pass : kPassHidden;
     }
 }

@@ -4,6 +4,7 @@
 #include "chart/UniverseView.h"
 
 #include "chart/CoarseCull.h"
+#include "chart/StarBrightness.h"
 
 #include "core/Truncate.h"
 #include "core/VectorClones.h"
@@ -14,15 +15,6 @@
 #include <cstring>
 
 namespace {
-
-// The glow's side in pixels for brightness b (at least 16): from the highest set bit k of
-// trunc(b), k^2 / 8, at most 64.
-int32_t GlowSize(double b)
-{
-    const auto n = static_cast<uint64_t>(std::min(b, 9.2e18));
-    const int32_t k = std::max(2, 63 - std::countl_zero(n));
-    return std::min(64, k * k / 8);
-}
 
 // Systems transformed and culled at a time: small enough for the stack and the first-level
 // cache, large enough to keep the vector loop busy; a multiple of 8.
@@ -181,9 +173,10 @@ void UniverseView::RenderSpan(RBitmap8* target, int32_t begin, int32_t end, int3
     const double* px = fPositionX.data();
     const double* py = fPositionY.data();
     const double* pz = fPositionZ.data();
+    const float* passLum = fPassLum.data();
     // Flags the chunk from first on and writes the places of its flagged systems; returns how
-    // many there are. Their brightnesses and tables, which the coarse test did not read, are
-    // fetched into the cache meanwhile: the chunk is drawn after the next one is flagged.
+    // many there are. Their tables, which the coarse test did not read, are fetched into the
+    // cache meanwhile: the chunk is drawn after the next one is flagged.
     const CoarseCamera coarse { camera.m00, camera.m01, camera.m02, camera.m03, camera.m10,
         camera.m11, camera.m12, camera.m13, camera.m20, camera.m21, camera.m22, camera.m23,
         camera.reachX, camera.reachY };
@@ -220,12 +213,9 @@ void UniverseView::RenderSpan(RBitmap8* target, int32_t begin, int32_t end, int3
             words[j / 64] |= uint64_t(1) << (j % 64);
         }
         const int32_t flagged = Flagged(words, n, places);
-        for (int32_t v = 0; v < flagged; v++) {
-            const size_t i = size_t(first + places[v] * step);
-            __builtin_prefetch(&lumCache[i]);
-            if (!fTableOf.empty())
-                __builtin_prefetch(&fTableOf[i]);
-        }
+        if (!fTableOf.empty())
+            for (int32_t v = 0; v < flagged; v++)
+                __builtin_prefetch(&fTableOf[size_t(first + places[v] * step)]);
         return flagged;
     };
     // What is to be drawn, in order, since the order of additive pixels matters: a point of
@@ -294,7 +284,7 @@ void UniverseView::RenderSpan(RBitmap8* target, int32_t begin, int32_t end, int3
 
             // Inverse square of the depth along the view axis, not of the true distance. Without
             // spectral tables there is nothing to draw with.
-            const double b = lumCache[size_t(i)] / (z * z);
+            const double b = DrawBrightness(passLum[i], z * z, [&] { return lumCache[size_t(i)]; });
             if (table && b < 16.0) {
                 const auto brightness = static_cast<int32_t>(b);
                 if (brightness >= 1)
