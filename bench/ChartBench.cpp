@@ -23,6 +23,7 @@
 #include <memory>
 #include <mutex>
 #include <random>
+#include <utility>
 
 namespace {
 
@@ -84,33 +85,67 @@ double LimitMilliseconds(UniverseView& view)
     return runs[4];
 }
 
-// range(0): 0 for the real catalogue, else a synthetic universe of that many systems;
-// range(1): threads; range(2): 0 the default view, 1 every system in front; range(3): 1 blocks
-// of systems for each thread, 0 single systems in turn; range(4): the frame's width, 640 the
-// chart's own 640 x 480, 1920 a maximised 1920 x 1061.
-void BM_Frame(benchmark::State& state)
+// A view of the frame benchmarks, set up for its first frame: the default view, or (front) far
+// enough back that the whole universe lies in front of the camera and on screen.
+std::unique_ptr<UniverseView> FrameView(
+    Universe* universe, int32_t threads, bool front, bool blocks, bool big)
 {
-    Universe* universe = UniverseOf(state.range(0));
-    const bool big = state.range(4) == 1920;
-    UniverseView view(BRect(0, 0, big ? 1919 : 639, big ? 1060 : 479), "UniverseView", universe,
-        int32_t(state.range(1)));
-    view.interleaveBlocks = state.range(3) != 0;
-    view.InitOffscreen();
-    if (state.range(2) == 1) {
-        // Far enough back that the whole universe lies in front of the camera and on screen.
+    auto view = std::make_unique<UniverseView>(
+        BRect(0, 0, big ? 1919 : 639, big ? 1060 : 479), "UniverseView", universe, threads);
+    view->interleaveBlocks = blocks;
+    view->InitOffscreen();
+    if (front) {
         double farthest = 0;
         for (int32_t i = 0; i < universe->CountItems(); i++)
             farthest = std::max(farthest, universe->SystemAt(i)->position.Magnitude());
-        view.cameraDistance = 2.5 * farthest + 1;
-        *view.GetRadialVelocityY() = 0;
-        view.NextTransform();
+        view->cameraDistance = 2.5 * farthest + 1;
+        *view->GetRadialVelocityY() = 0;
+        view->NextTransform();
     }
-    view.HideGreaterThan(*view.GetDistanceFilter());
-    view.CalculateLumCache();
-    const double limit = LimitMilliseconds(view);
+    view->HideGreaterThan(*view->GetDistanceFilter());
+    view->CalculateLumCache();
+    return view;
+}
+
+// Milliseconds a frame of each view, drawn in turns of a few frames, one view after the other,
+// so that both meet the machine as it is in the same few milliseconds: the ratio of the two is
+// what a second thread gains, free of the minutes-long swings of a shared machine.
+std::pair<double, double> PairedMilliseconds(UniverseView& a, UniverseView& b)
+{
+    constexpr int kTurns = 12, kWarm = 2, kTimed = 6;
+    double ms[2] = {};
+    for (int turn = 0; turn < kTurns; turn++) {
+        int k = 0;
+        for (UniverseView* view : { &a, &b }) {
+            for (int frame = 0; frame < kWarm; frame++)
+                view->Render();
+            const auto start = std::chrono::steady_clock::now();
+            for (int frame = 0; frame < kTimed; frame++)
+                view->Render();
+            ms[k++] += std::chrono::duration<double, std::milli>(
+                std::chrono::steady_clock::now() - start)
+                           .count();
+        }
+    }
+    return { ms[0] / (kTurns * kTimed), ms[1] / (kTurns * kTimed) };
+}
+
+// range(0): 0 for the real catalogue, else a synthetic universe of that many systems;
+// range(1): threads; range(2): 0 the default view, 1 every system in front; range(3): 1 blocks
+// of systems for each thread, 0 single systems in turn; range(4): the frame's width, 640 the
+// chart's own 640 x 480, 1920 a maximised 1920 x 1061. With more than one thread, speedup is
+// the one-thread frame's time over this one's, the two drawn in turns (PairedMilliseconds).
+void BM_Frame(benchmark::State& state)
+{
+    Universe* universe = UniverseOf(state.range(0));
+    const int32_t threads = int32_t(state.range(1));
+    const bool front = state.range(2) == 1, blocks = state.range(3) != 0;
+    const bool big = state.range(4) == 1920;
+    const auto view = FrameView(universe, threads, front, blocks, big);
+    const double limit = LimitMilliseconds(*view);
     const auto start = std::chrono::steady_clock::now();
     for (auto _ : state)
-        view.Render();
+        view->Render();
     const double frame
         = std::chrono::duration<double, std::milli>(std::chrono::steady_clock::now() - start)
               .count()
@@ -118,6 +153,11 @@ void BM_Frame(benchmark::State& state)
     state.counters["systems"] = double(universe->CountItems());
     state.counters["limit_ms"] = limit;
     state.counters["over_limit"] = frame / limit;
+    if (threads > 1) {
+        const auto single = FrameView(universe, 1, front, blocks, big);
+        const auto [one, many] = PairedMilliseconds(*single, *view);
+        state.counters["speedup"] = one / many;
+    }
 }
 
 // A chart running as in the program, shown (on the offscreen platform) and turning, its frames

@@ -273,6 +273,14 @@ private:
     // A share of the last frame was still being drawn when its wait timed out; only whoever
     // draws frames touches it.
     bool fSharesMissing = false;
+    // Workers' shares of this frame drawn so far: what the main render thread watches for a
+    // moment before it sleeps on renderSync, which alone decides when the frame goes on.
+    std::atomic<int32_t> fSharesDrawn { 0 };
+    // How long a render thread that waits for the others, or for the next frame, watches before
+    // it sleeps: 0 where the threads outnumber the processors, since the thread waited for may
+    // need this very processor.
+    int64_t fSpinMicros = 0;
+    static constexpr int64_t kSpinMicros = 250;
     std::function<void(int32_t)> fShareHook;
     std::atomic<int64_t> framesRendered { 0 };
     std::atomic<int32_t> fViewWidth { 0 }, fViewHeight { 0 }; // the widget's size, for resizes

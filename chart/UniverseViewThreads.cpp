@@ -95,9 +95,13 @@ void UniverseView::DrawShares()
     // The workers draw their shares while this thread draws its own; one unit of renderSync for
     // each share, the wait bounded at two seconds. After a time-out the frame goes on with what
     // is drawn, and the units still to come are collected before the next frame.
+    fSharesDrawn.store(0, std::memory_order_relaxed);
     for (int32_t k = 1; k < threadCount; k++)
         workerParks[k].Resume();
     RenderShare(threadCount, 0);
+    // The workers' shares are as long as this one and usually end within moments of it.
+    SpinUntil(fSpinMicros,
+        [&] { return fSharesDrawn.load(std::memory_order_acquire) >= threadCount - 1; });
     release_sem(renderSync);
     fSharesMissing
         = acquire_sem_etc(renderSync, threadCount, B_RELATIVE_TIMEOUT, 2000000) == B_TIMED_OUT;
@@ -133,8 +137,10 @@ void UniverseView::StartWorkers()
     if (workersStarted)
         return;
     renderSync = create_sem(0, "Render Sync Semaphore");
+    fSpinMicros = unsigned(threadCount) <= std::thread::hardware_concurrency() ? kSpinMicros : 0;
     for (int32_t k = 1; k < threadCount; k++) {
         workerParks[k].Reset();
+        workerParks[k].SetSpin(fSpinMicros);
         renderThreads[k - 1] = std::thread([this, k] {
             NameThread("Render Thread");
             RenderLoop(k);
@@ -164,6 +170,7 @@ void UniverseView::RenderLoop(int32_t index)
         if (fShareHook)
             fShareHook(index);
         RenderShareInto(target, threadCount, index);
+        fSharesDrawn.fetch_add(1, std::memory_order_release);
         release_sem(renderSync);
     }
 }
