@@ -4,7 +4,6 @@
 #include "platform/Semaphore.h"
 
 #include <chrono>
-#include <ctime>
 #include <thread>
 
 bigtime_t system_time()
@@ -21,7 +20,11 @@ void snooze(bigtime_t microseconds)
 
 uint32_t real_time_clock()
 {
-    return static_cast<uint32_t>(std::time(nullptr));
+    // From the system clock itself: time() reads a coarser copy of it that lags by up to a tick,
+    // so just after a second begins it could still give the second before.
+    return static_cast<uint32_t>(std::chrono::duration_cast<std::chrono::seconds>(
+        std::chrono::system_clock::now().time_since_epoch())
+                                     .count());
 }
 
 sem_id create_sem(int32_t count, const char* name)
